@@ -1,0 +1,6 @@
+# The sanitized build instruments every target, tests included, and stops at the first report.
+if(QV_SANITIZE)
+  add_compile_options(-fsanitize=address,undefined -fno-sanitize-recover=all
+                      -fno-omit-frame-pointer -g)
+  add_link_options(-fsanitize=address,undefined)
+endif()

@@ -1,0 +1,100 @@
+#include "platform/tStatus.h"
+
+#include <gtest/gtest.h>
+
+#include <cstring>
+
+namespace {
+
+TEST(tStatusTest, FreshRecordIsSuccessWithFullSize) {
+    tStatus status;
+    EXPECT_EQ(status.structSize, 208U);
+    EXPECT_EQ(status.code, 0);
+    EXPECT_TRUE(status.succeeded());
+    EXPECT_STREQ(status.component, "");
+    EXPECT_STREQ(status.file, "");
+}
+
+TEST(tStatusTest, FirstErrorWinsWithItsDetails) {
+    tStatus status;
+    EXPECT_TRUE(status.set(-52000, "qvptp3u", "first.cpp", 10));
+    EXPECT_FALSE(status.set(-52012, "other", "second.cpp", 20));
+    EXPECT_EQ(status.code, -52000);
+    EXPECT_STREQ(status.component, "qvptp3u");
+    EXPECT_STREQ(status.file, "first.cpp");
+    EXPECT_EQ(status.line, 10U);
+}
+
+TEST(tStatusTest, ErrorReplacesWarningButWarningReplacesOnlySuccess) {
+    tStatus status;
+    EXPECT_TRUE(status.set(5, "c", "f", 1));
+    EXPECT_FALSE(status.set(7, "c", "f", 2));
+    EXPECT_EQ(status.code, 5);
+    EXPECT_TRUE(status.set(-52000, "c", "f", 3));
+    EXPECT_EQ(status.code, -52000);
+    EXPECT_FALSE(status.set(0, "c", "f", 4));
+    EXPECT_EQ(status.code, -52000);
+}
+
+TEST(tStatusTest, LongNamesAreCutAndTerminated) {
+    tStatus status;
+    status.set(-1, "qvptpmgmt3u", std::string(150, 'f').c_str(), 1);
+    EXPECT_STREQ(status.component, "qvptpmgmt");
+    EXPECT_EQ(std::strlen(status.file), 100U);
+}
+
+TEST(tStatusTest, ShortRecordReceivesCodeOnly) {
+    tStatus status;
+    status.structSize = 8;
+    EXPECT_TRUE(status.set(-52003, "qvptp3u", "x.cpp", 9));
+    EXPECT_EQ(status.code, -52003);
+    EXPECT_STREQ(status.component, "");
+    EXPECT_EQ(status.line, 0U);
+}
+
+TEST(tStatusTest, ResetForgivesEverything) {
+    tStatus status;
+    status.set(-52012, "qvptp3u", "x.cpp", 9);
+    status.extension[0] = 99;
+    status.reset();
+    EXPECT_EQ(status.code, 0);
+    EXPECT_STREQ(status.component, "");
+    EXPECT_STREQ(status.file, "");
+    EXPECT_EQ(status.line, 0U);
+    EXPECT_EQ(status.extension[0], 0U);
+}
+
+TEST(tStatusTest, MergeFollowsTheRecordingRuleAndCopiesExtensions) {
+    tStatus other;
+    other.set(-52009, "qvptp3u", "net.cpp", 42);
+    other.extension[3] = 7;
+    tStatus status;
+    status.merge(other);
+    EXPECT_EQ(status.code, -52009);
+    EXPECT_STREQ(status.file, "net.cpp");
+    EXPECT_EQ(status.extension[3], 7U);
+
+    tStatus later;
+    later.set(-52003, "x", "y", 1);
+    status.merge(later);
+    EXPECT_EQ(status.code, -52009);
+}
+
+TEST(tStatusTest, MergeFromShortRecordBringsNoDetails) {
+    tStatus other;
+    other.structSize = 8;
+    other.code = -52015;
+    tStatus status;
+    status.merge(other);
+    EXPECT_EQ(status.code, -52015);
+    EXPECT_STREQ(status.component, "");
+}
+
+TEST(tStatusTest, MacroRecordsFileWithoutDirectories) {
+    tStatus status;
+    QV_STATUS_SET(status, kStatusNoData, kComponentCodec);
+    EXPECT_STREQ(status.file, "tStatusTest.cpp");
+    EXPECT_STREQ(sourceBaseName("a\\b/c\\d.cpp"), "d.cpp");
+}
+
+}  // namespace

@@ -1,0 +1,72 @@
+#include "tests/support/FailingAllocation.h"
+
+#include <cstdlib>
+#include <new>
+
+namespace {
+
+thread_local unsigned allocationsBeforeFailure = 0;  // 0: no failure planned
+thread_local bool failureTriggered = false;
+
+void* allocate(std::size_t size) {
+    if (allocationsBeforeFailure != 0 && --allocationsBeforeFailure == 0) {
+        failureTriggered = true;
+        throw std::bad_alloc();
+    }
+    if (void* p = std::malloc(size == 0 ? 1 : size)) {
+        return p;
+    }
+    throw std::bad_alloc();
+}
+
+}  // namespace
+
+namespace qvtest {
+
+ScopedAllocationFailure::ScopedAllocationFailure(unsigned nth) {
+    failureTriggered = false;
+    allocationsBeforeFailure = nth;
+}
+
+ScopedAllocationFailure::~ScopedAllocationFailure() {
+    allocationsBeforeFailure = 0;
+}
+
+bool ScopedAllocationFailure::triggered() const {
+    return failureTriggered;
+}
+
+}  // namespace qvtest
+
+void* operator new(std::size_t size) {
+    return allocate(size);
+}
+void* operator new[](std::size_t size) {
+    return allocate(size);
+}
+void* operator new(std::size_t size, const std::nothrow_t&) noexcept {
+    try {
+        return allocate(size);
+    } catch (const std::bad_alloc&) {
+        return nullptr;
+    }
+}
+void* operator new[](std::size_t size, const std::nothrow_t&) noexcept {
+    try {
+        return allocate(size);
+    } catch (const std::bad_alloc&) {
+        return nullptr;
+    }
+}
+void operator delete(void* p) noexcept {
+    std::free(p);
+}
+void operator delete[](void* p) noexcept {
+    std::free(p);
+}
+void operator delete(void* p, std::size_t) noexcept {
+    std::free(p);
+}
+void operator delete[](void* p, std::size_t) noexcept {
+    std::free(p);
+}
