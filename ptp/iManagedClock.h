@@ -6,7 +6,7 @@ namespace nQVPTP000 {
 // The clock that the responder operations of the management TLVs read and change: a PTP
 // node that embeds this codec implements it.
 class iManagedClock {
-public:
+  public:
     virtual ~iManagedClock() = default;
 };
 
