@@ -1,0 +1,121 @@
+#include "platform/tTrace.h"
+
+#include <gtest/gtest.h>
+
+#include <string>
+
+#include "platform/tConsoleTraceDestination.h"
+#include "tests/support/TraceCapture.h"
+
+using nQVTARN000::tTrace;
+
+namespace {
+
+class tTraceTest : public ::testing::Test {
+  protected:
+    qvtest::RecordingDestination destination;
+    tTrace trace{&destination};
+};
+
+std::string padded(const std::string& fields) {
+    return fields + std::string(49 - fields.size(), '-') + "] ";
+}
+
+TEST_F(tTraceTest, DefaultHeaderNamesComponentLineAndFileOnly) {
+    trace.beginLine("qvptp3u", 105, "C:\\src/ptp\\factory.cpp", 105, 0).append("hello").endLine();
+    EXPECT_EQ(destination.text(), padded("[qvptp3u--105--factory.cpp") + "hello\n");
+    ASSERT_EQ(destination.pieces().size(), 1U);
+}
+
+TEST_F(tTraceTest, HeaderLongerThan49IsCut) {
+    const std::string file = "tOrganizationExtensionTLVFactory.cpp";
+    trace.beginLine("qvptp3u", 105, file.c_str(), 105, 0).endLine();
+    const std::string full = "[qvptp3u--105--" + file;
+    EXPECT_EQ(destination.text(), full.substr(0, 49) + "] \n");
+}
+
+TEST_F(tTraceTest, HeaderWithNoFieldsIsBlankWithoutBracket) {
+    trace.setFlag(tTrace::Flag::showComponent, false)
+        .setFlag(tTrace::Flag::showLine, false)
+        .setFlag(tTrace::Flag::showFile, false);
+    trace.beginLine("c", 1, "f", 0, 0).append("x").endLine();
+    EXPECT_EQ(destination.text(), std::string(49, ' ') + "x\n");
+}
+
+TEST_F(tTraceTest, OptionalFieldsFollowInTheirOrder) {
+    trace.setFlag(tTrace::Flag::showVersion, true).setFlag(tTrace::Flag::showCode, true);
+    trace.beginLine("c", 7, "f.cpp", -3, 0).endLine();
+    EXPECT_EQ(destination.text(), padded("[c--v1.0--7--f.cpp---3") + "\n");
+}
+
+TEST_F(tTraceTest, LongPieceReachesDestinationInPiecesOf253) {
+    trace.append(std::string(600, 'a').c_str());
+    trace.endLine();
+    ASSERT_EQ(destination.pieces().size(), 3U);
+    EXPECT_EQ(destination.pieces()[0].size(), 253U);
+    EXPECT_EQ(destination.pieces()[1].size(), 253U);
+    EXPECT_EQ(destination.pieces()[2], std::string(94, 'a') + "\n");
+}
+
+TEST_F(tTraceTest, EachLineEndFinishesAPiece) {
+    trace.append("one\ntwo\n");
+    EXPECT_EQ(destination.pieces(), (std::vector<std::string>{"one\n", "two\n"}));
+}
+
+TEST_F(tTraceTest, OverlongFormattedTextIsAnnouncedAndCut) {
+    const std::string big(2000, 'z');
+    trace.appendFormatted("%s", big.c_str());
+    trace.endLine();
+    const std::string text = destination.text();
+    const std::string notice = "!!Formatted string exceeds kMaxTraceLine characters!!";
+    EXPECT_EQ(text, notice + std::string(1023, 'z') + "\n");
+}
+
+TEST_F(tTraceTest, DisabledTraceAndSuppressedLineIgnoreAppends) {
+    trace.suppress().append("hidden").append(true);
+    trace.endLine();
+    trace.append("shown").endLine();
+    EXPECT_EQ(destination.text(), "\nshown\n");
+
+    destination.clear();
+    trace.setFlag(tTrace::Flag::enabled, false);
+    trace.beginLine("c", 1, "f", 0, 0).append("x").endLine();
+    EXPECT_TRUE(destination.pieces().empty());
+}
+
+TEST_F(tTraceTest, ValuesAppendInTheirFixedForms) {
+    trace.append(true).append(' ').append(false).append(' ');
+    trace.append(std::int32_t{-2147483647 - 1}).append(' ').append(std::int8_t{-5}).append(' ');
+    trace.append(std::uint16_t{65535}).append(' ').append(std::uint32_t{255}, 16);
+    trace.endLine();
+    EXPECT_EQ(destination.text(), "true(1) false(0) -2147483648 -5 65535 ff\n");
+}
+
+TEST_F(tTraceTest, NestingIndentsLinesBetweenOpenAndClose) {
+    trace.setFlag(tTrace::Flag::showComponent, false)
+        .setFlag(tTrace::Flag::showLine, false)
+        .setFlag(tTrace::Flag::showFile, false)
+        .setHeaderWidth(1);
+    trace.beginLine("", 0, "", 0, tTrace::kOpenLevel).append("a").endLine();
+    trace.beginLine("", 0, "", 0, tTrace::kNoNesting).append("b").endLine();
+    trace.beginLine("", 0, "", 0, tTrace::kCloseLevel).append("c").endLine();
+    trace.beginLine("", 0, "", 0, tTrace::kCloseLevel).append("d").endLine();
+    EXPECT_EQ(destination.text(), "a\n  b\nc\nd\n");
+}
+
+TEST(tConsoleTraceDestinationTest, PiecesReachTheDebugOutput) {
+    qvtest::DebugOutputCapture capture;
+    nQVTARN000::tConsoleTraceDestination console;
+    console.write("abcdef", 3);
+    console.write("line\n");
+    EXPECT_EQ(capture.pieces(), (std::vector<std::string>{"abc", "line\n"}));
+
+    char buffer[8];
+    std::uint32_t needed = 0;
+    console.describe(buffer, sizeof(buffer), needed);
+    EXPECT_STREQ(buffer, " --dest");
+    EXPECT_EQ(needed, 20U);
+    EXPECT_STREQ(console.getName(), "nQVTARNS100_printf");
+}
+
+}  // namespace
