@@ -63,7 +63,7 @@ class StringBase {
         if (begin_ != nullptr && newLength <= capacity() &&
             std::uint64_t{newLength} * 2 >= capacity()) {
             // The source may lie inside this buffer.
-            if (newLength != 0) {
+            if (count != 0) {
                 std::memmove(begin_, text, newLength * sizeof(Char));
             }
             end_ = begin_ + newLength;
@@ -73,7 +73,7 @@ class StringBase {
         std::uint32_t bufferLength = newLength;
         SafeInteger::addAssign(bufferLength, 1);
         auto* buffer = static_cast<Char*>(TaskMemory::allocate(bufferLength * sizeof(Char)));
-        if (newLength != 0) {
+        if (count != 0) {
             std::memcpy(buffer, text, newLength * sizeof(Char));
         }
         buffer[newLength] = Char{};
