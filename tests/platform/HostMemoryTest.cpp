@@ -15,7 +15,9 @@ using qv::dsc::TaskMemory;
 
 // Under AddressSanitizer an impossible size must come back as null, as it does from the C
 // library, instead of stopping the program: that null is what these tests are about.
-extern "C" const char* __asan_default_options() { return "allocator_may_return_null=1"; }
+extern "C" const char* __asan_default_options() {
+    return "allocator_may_return_null=1";
+}
 
 TEST(TaskMemoryTest, ImpossibleSizesThrowBadAlloc) {
     const std::size_t huge = std::numeric_limits<std::size_t>::max() / 2;
