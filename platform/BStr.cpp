@@ -60,7 +60,7 @@ std::uint32_t BStr::length(const WideChar* text) noexcept {
     }
     std::uint32_t octets = 0;
     std::memcpy(&octets, blockOf(text), kPrefixSize);
-    return octets / sizeof(WideChar);
+    return octets / static_cast<std::uint32_t>(sizeof(WideChar));
 }
 
 }  // namespace qv::dsc
