@@ -304,11 +304,11 @@ bool tPTPClockProxy::isOrdinaryClock() const {
 }
 bool tPTPClockProxy::isP2PTransparentClock() const {
     return readDescription(
-        [](const tClockDescriptionTLV& d) { return d.getP2PTransparentClock(); }, false);
+        [](const tClockDescriptionTLV& d) { return d.getP2pTransparentClock(); }, false);
 }
 bool tPTPClockProxy::isE2ETransparentClock() const {
     return readDescription(
-        [](const tClockDescriptionTLV& d) { return d.getE2ETransparentClock(); }, false);
+        [](const tClockDescriptionTLV& d) { return d.getE2eTransparentClock(); }, false);
 }
 bool tPTPClockProxy::isBoundaryClock() const {
     return readDescription([](const tClockDescriptionTLV& d) { return d.getBoundaryClock(); },
@@ -349,19 +349,20 @@ void tPTPClockProxy::copyText(tPTPText (tClockDescriptionTLV::*getter)() const, 
     }
 }
 
-void tPTPClockProxy::copyOctets(const std::uint8_t* (tClockDescriptionTLV::*getter)() const,
-                                std::uint16_t count, std::uint8_t* buffer, std::uint16_t size,
+// Copies a field of octets, or records -52012 when the buffer is smaller than the field.
+template <typename Field>
+void tPTPClockProxy::copyOctets(Field field, std::uint8_t* buffer, std::uint16_t size,
                                 tStatus& status) const {
     if (status.failed()) {
         return;
     }
     const bool described = readDescription(
         [&](const tClockDescriptionTLV& d) {
-            const std::uint16_t length = count != 0 ? count : d.getPhysicalAddressLength();
-            if (length > size) {
+            const auto octets = field(d);
+            if (octets.size() > size) {
                 QV_STATUS_SET(status, kStatusNoData, kComponentMgmt);
-            } else if (length != 0) {
-                std::memcpy(buffer, (d.*getter)(), length);
+            } else if (!octets.empty()) {
+                std::memcpy(buffer, octets.data(), octets.size());
             }
             return true;
         },
@@ -388,15 +389,18 @@ void tPTPClockProxy::getCachedUserDescription(char* buffer, std::uint16_t size,
 }
 void tPTPClockProxy::getPhysicalAddress(std::uint8_t* buffer, std::uint16_t size,
                                         tStatus& status) const {
-    copyOctets(&tClockDescriptionTLV::getPhysicalAddress, 0, buffer, size, status);
+    copyOctets([](const tClockDescriptionTLV& d) { return d.getPhysicalAddress(); }, buffer, size,
+               status);
 }
 void tPTPClockProxy::getManufacturerIdentity(std::uint8_t* buffer, std::uint16_t size,
                                              tStatus& status) const {
-    copyOctets(&tClockDescriptionTLV::getManufacturerIdentity, 3, buffer, size, status);
+    copyOctets([](const tClockDescriptionTLV& d) { return d.getManufacturerIdentity(); }, buffer,
+               size, status);
 }
 void tPTPClockProxy::getProfileIdentity(std::uint8_t* buffer, std::uint16_t size,
                                         tStatus& status) const {
-    copyOctets(&tClockDescriptionTLV::getProfileIdentity, 6, buffer, size, status);
+    copyOctets([](const tClockDescriptionTLV& d) { return d.getProfileIdentity(); }, buffer,
+               size, status);
 }
 
 tClockDescriptionTLV tPTPClockProxy::refreshClockDescription(tStatus& status) {

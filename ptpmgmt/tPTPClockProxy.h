@@ -137,8 +137,8 @@ private:
     Result readDescription(Read&& read, Result failure) const;
     void copyText(nQVPTP000::tPTPText (nQVPTP000::tClockDescriptionTLV::*getter)() const,
                   char* buffer, std::uint16_t size, tStatus& status) const;
-    void copyOctets(const std::uint8_t* (nQVPTP000::tClockDescriptionTLV::*getter)() const,
-                    std::uint16_t count, std::uint8_t* buffer, std::uint16_t size,
+    template <typename Field>
+    void copyOctets(Field field, std::uint8_t* buffer, std::uint16_t size,
                     tStatus& status) const;
 
     tPTPMgmtNode* node_;  // not owned: the node owns this proxy
