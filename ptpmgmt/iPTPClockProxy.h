@@ -25,7 +25,7 @@ namespace nQVPTPMGMT000 {
 // that finds an error already recorded sends nothing; a failed one leaves its code in the
 // status and returns the documented failure value.
 class iPTPClockProxy {
-public:
+  public:
     virtual ~iPTPClockProxy() = default;
     // Takes the other proxy's node, domain, time-out and target; not its cached description.
     virtual iPTPClockProxy& assign(const iPTPClockProxy& other) = 0;
@@ -46,8 +46,7 @@ public:
                                     tStatus& status) const = 0;
     virtual void getManufacturerIdentity(std::uint8_t* buffer, std::uint16_t size,
                                          tStatus& status) const = 0;
-    virtual void getProductDescription(char* buffer, std::uint16_t size,
-                                       tStatus& status) const = 0;
+    virtual void getProductDescription(char* buffer, std::uint16_t size, tStatus& status) const = 0;
     virtual void getRevisionData(char* buffer, std::uint16_t size, tStatus& status) const = 0;
     virtual void getCachedUserDescription(char* buffer, std::uint16_t size,
                                           tStatus& status) const = 0;
@@ -101,10 +100,9 @@ public:
     virtual nQVPTP000::tUTCPropertiesTLV getUTCProperties(tStatus& status) = 0;
     virtual void setUTCProperties(const nQVPTP000::tUTCPropertiesTLV& properties,
                                   tStatus& status) = 0;
-    virtual nQVPTP000::tTraceabilityPropertiesTLV getTraceabilityProperties(
-        tStatus& status) = 0;
-    virtual void setTraceabilityProperties(
-        const nQVPTP000::tTraceabilityPropertiesTLV& properties, tStatus& status) = 0;
+    virtual nQVPTP000::tTraceabilityPropertiesTLV getTraceabilityProperties(tStatus& status) = 0;
+    virtual void setTraceabilityProperties(const nQVPTP000::tTraceabilityPropertiesTLV& properties,
+                                           tStatus& status) = 0;
     // The 10-octet clock key of the target port.
     virtual const std::uint8_t* getClockKey() = 0;
 };

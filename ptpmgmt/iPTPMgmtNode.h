@@ -13,7 +13,7 @@ class iPTPClockProxy;
 // The management node as the expert sees it: discovery, the list of clock ports found,
 // and the life of the receive thread.
 class iPTPMgmtNode {
-public:
+  public:
     virtual ~iPTPMgmtNode() = default;
     // Discovery in domain 0 only, waiting `timeoutMs` for answers.
     virtual void findClocksInDefaultDomain(std::uint16_t timeoutMs, tStatus& status) = 0;

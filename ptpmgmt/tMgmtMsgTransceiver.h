@@ -27,7 +27,7 @@ namespace nQVPTPMGMT000 {
 // Locks: sendLock_ may be held while pendingLock_ is taken; pendingLock_ may be held while
 // responsesLock_ is taken; never the other way round. arrivalLock_ is taken alone.
 class tMgmtMsgTransceiver final : public nQVTARN000::iThread {
-public:
+  public:
     using tClock = std::chrono::steady_clock;
 
     tMgmtMsgTransceiver(nQVPTP000::iPTPPortMessaging* transport,
@@ -68,13 +68,13 @@ public:
     tStatus lastReceiveError() const;
     bool isRunning() const { return running_.load(); }
 
-private:
+  private:
     bool matches(const nQVPTP000::tPTPMessage& message, tStatus& status) const;
     void store(std::unique_ptr<nQVPTP000::tManagementMessage> message, tStatus& status);
     void noteReceiveError(tStatus& threadStatus);
 
-    std::uint32_t nextSequenceId_ = 0;            // guarded by sendLock_
-    nQVPTP000::iPTPPortMessaging* transport_;     // not owned
+    std::uint32_t nextSequenceId_ = 0;         // guarded by sendLock_
+    nQVPTP000::iPTPPortMessaging* transport_;  // not owned
     const nQVPTP000::tPortIdentity localPortIdentity_;
     bool ready_ = false;
     std::atomic<bool> running_{false};

@@ -31,8 +31,8 @@ namespace nQVPTPMGMT000 {
 using namespace nQVPTP000;
 using tAction = tManagementMessagePayload::tActionField;
 
-tPTPClockProxy::tPTPClockProxy(tPTPMgmtNode* node, const tClockKey& key,
-                               tDescription description, tStatus& status)
+tPTPClockProxy::tPTPClockProxy(tPTPMgmtNode* node, const tClockKey& key, tDescription description,
+                               tStatus& status)
     : node_(node), target_(allOnesPortIdentity()), cachedDescription_(std::move(description)) {
     if (status.succeeded()) {
         target_ = portIdentityOf(key);
@@ -106,8 +106,7 @@ TLV tPTPClockProxy::getRecord(tStatus& status) {
 }
 
 template <typename TLV>
-void tPTPClockProxy::run(std::unique_ptr<TLV> payload, std::uint32_t actionField,
-                         tStatus& status) {
+void tPTPClockProxy::run(std::unique_ptr<TLV> payload, std::uint32_t actionField, tStatus& status) {
     exchange(std::move(payload), actionField, status);
 }
 
@@ -303,12 +302,12 @@ bool tPTPClockProxy::isOrdinaryClock() const {
                            false);
 }
 bool tPTPClockProxy::isP2PTransparentClock() const {
-    return readDescription(
-        [](const tClockDescriptionTLV& d) { return d.getP2pTransparentClock(); }, false);
+    return readDescription([](const tClockDescriptionTLV& d) { return d.getP2pTransparentClock(); },
+                           false);
 }
 bool tPTPClockProxy::isE2ETransparentClock() const {
-    return readDescription(
-        [](const tClockDescriptionTLV& d) { return d.getE2eTransparentClock(); }, false);
+    return readDescription([](const tClockDescriptionTLV& d) { return d.getE2eTransparentClock(); },
+                           false);
 }
 bool tPTPClockProxy::isBoundaryClock() const {
     return readDescription([](const tClockDescriptionTLV& d) { return d.getBoundaryClock(); },
@@ -399,8 +398,8 @@ void tPTPClockProxy::getManufacturerIdentity(std::uint8_t* buffer, std::uint16_t
 }
 void tPTPClockProxy::getProfileIdentity(std::uint8_t* buffer, std::uint16_t size,
                                         tStatus& status) const {
-    copyOctets([](const tClockDescriptionTLV& d) { return d.getProfileIdentity(); }, buffer,
-               size, status);
+    copyOctets([](const tClockDescriptionTLV& d) { return d.getProfileIdentity(); }, buffer, size,
+               status);
 }
 
 tClockDescriptionTLV tPTPClockProxy::refreshClockDescription(tStatus& status) {

@@ -30,7 +30,7 @@ class tPTPMgmtNode;
 // The cached clock description is shared with the node, so that a discovery replacing it
 // never pulls it away from under a reader on another thread.
 class tPTPClockProxy final : public iPTPClockProxy {
-public:
+  public:
     static constexpr std::uint16_t kTimeoutMs = 5000;
     using tDescription = std::shared_ptr<nQVPTP000::tManagementMessage>;
 
@@ -45,8 +45,7 @@ public:
     bool isP2PTransparentClock() const override;
     bool isE2ETransparentClock() const override;
     bool isBoundaryClock() const override;
-    void getPhysicalLayerProtocol(char* buffer, std::uint16_t size,
-                                  tStatus& status) const override;
+    void getPhysicalLayerProtocol(char* buffer, std::uint16_t size, tStatus& status) const override;
     std::uint16_t getPhysicalAddressLength() const override;
     void getPhysicalAddress(std::uint8_t* buffer, std::uint16_t size,
                             tStatus& status) const override;
@@ -54,8 +53,7 @@ public:
                                  tStatus& status) const override;
     void getProductDescription(char* buffer, std::uint16_t size, tStatus& status) const override;
     void getRevisionData(char* buffer, std::uint16_t size, tStatus& status) const override;
-    void getCachedUserDescription(char* buffer, std::uint16_t size,
-                                  tStatus& status) const override;
+    void getCachedUserDescription(char* buffer, std::uint16_t size, tStatus& status) const override;
     void getProfileIdentity(std::uint8_t* buffer, std::uint16_t size,
                             tStatus& status) const override;
 
@@ -99,8 +97,7 @@ public:
     nQVPTP000::tParentDataSetTLV getParentDataSet(tStatus& status) override;
     nQVPTP000::tPortDataSetTLV getPortDataSet(tStatus& status) override;
     nQVPTP000::tUTCPropertiesTLV getUTCProperties(tStatus& status) override;
-    void setUTCProperties(const nQVPTP000::tUTCPropertiesTLV& properties,
-                          tStatus& status) override;
+    void setUTCProperties(const nQVPTP000::tUTCPropertiesTLV& properties, tStatus& status) override;
     nQVPTP000::tTraceabilityPropertiesTLV getTraceabilityProperties(tStatus& status) override;
     void setTraceabilityProperties(const nQVPTP000::tTraceabilityPropertiesTLV& properties,
                                    tStatus& status) override;
@@ -116,7 +113,7 @@ public:
     void setCachedDescription(tDescription description);
     std::uint8_t getDomainNumber() const { return domainNumber_.load(); }
 
-private:
+  private:
     std::unique_ptr<nQVPTP000::tManagementMessage> exchange(
         std::unique_ptr<nQVPTP000::tManagementTLV> payload, std::uint32_t actionField,
         tStatus& status);
@@ -138,8 +135,7 @@ private:
     void copyText(nQVPTP000::tPTPText (nQVPTP000::tClockDescriptionTLV::*getter)() const,
                   char* buffer, std::uint16_t size, tStatus& status) const;
     template <typename Field>
-    void copyOctets(Field field, std::uint8_t* buffer, std::uint16_t size,
-                    tStatus& status) const;
+    void copyOctets(Field field, std::uint8_t* buffer, std::uint16_t size, tStatus& status) const;
 
     tPTPMgmtNode* node_;  // not owned: the node owns this proxy
     nQVPTP000::tPortIdentity target_;

@@ -1,5 +1,6 @@
 #include "ptpmgmt/tPTPMgmtNode.h"
 
+#include <algorithm>
 #include <new>
 #include <thread>
 
@@ -14,8 +15,8 @@ using nQVPTP000::tManagementMessagePayload;
 using nQVTARN000::tMutex;
 
 tPTPMgmtNode::tPTPMgmtNode(nQVPTP000::iPTPPortMessaging* transport,
-                           const nQVPTP000::tClockIdentity& clockIdentity,
-                           std::uint16_t portNumber, tStatus& status)
+                           const nQVPTP000::tClockIdentity& clockIdentity, std::uint16_t portNumber,
+                           tStatus& status)
     : portIdentity_(clockIdentity, portNumber),
       transceiver_(transport, clockIdentity, portNumber, status) {
     clockListLock_.create(status);
@@ -96,8 +97,7 @@ void tPTPMgmtNode::collect(std::uint16_t sequenceId, tStatus& status) {
     try {
         for (std::unique_ptr<tManagementMessage> answer =
                  transceiver_.takeResponse(sequenceId, status);
-             answer && status.succeeded();
-             answer = transceiver_.takeResponse(sequenceId, status)) {
+             answer && status.succeeded(); answer = transceiver_.takeResponse(sequenceId, status)) {
             const tClockKey key = makeClockKey(answer->getHeader()->getSourcePortIdentity());
             tDescription description(std::move(answer));
             descriptions_[key] = description;
@@ -197,8 +197,7 @@ std::unique_ptr<tManagementMessage> tPTPMgmtNode::sendAndAwait(
 // and gives up once ceil(timeoutMs / 50) steps of 50 ms have passed without one.
 std::unique_ptr<tManagementMessage> tPTPMgmtNode::await(std::uint16_t sequenceId,
                                                         const tManagementMessage& request,
-                                                        std::uint16_t timeoutMs,
-                                                        tStatus& status) {
+                                                        std::uint16_t timeoutMs, tStatus& status) {
     if (timeoutMs == 0) {
         QV_STATUS_SET(status, kStatusNoData, kComponentMgmt);
         return nullptr;
@@ -234,11 +233,11 @@ void tPTPMgmtNode::check(const tManagementMessage& request,
     }
     const std::uint32_t action = request.getActionField();
     const std::uint32_t reply = answer->getActionField();
-    const bool pairMatches = ((action == tManagementMessagePayload::kGet ||
-                               action == tManagementMessagePayload::kSet) &&
-                              reply == tManagementMessagePayload::kResponse) ||
-                             (action == tManagementMessagePayload::kCommand &&
-                              reply == tManagementMessagePayload::kAcknowledge);
+    const bool pairMatches =
+        ((action == tManagementMessagePayload::kGet || action == tManagementMessagePayload::kSet) &&
+         reply == tManagementMessagePayload::kResponse) ||
+        (action == tManagementMessagePayload::kCommand &&
+         reply == tManagementMessagePayload::kAcknowledge);
     if (payload->getTlvType() == nQVPTP000::tTLV::kManagementErrorStatus || !pairMatches ||
         payload->getManagementId() != asked->getManagementId()) {
         QV_STATUS_SET(status, kStatusNoData, kComponentMgmt);

@@ -23,7 +23,7 @@ class tPTPClockProxy;
 //
 // Lock order: clockListLock_, then requestLock_, then the transceiver's locks.
 class tPTPMgmtNode final : public iPTPMgmtNode {
-public:
+  public:
     static constexpr std::uint8_t kDiscoveryDomains = 4;
     static constexpr std::uint32_t kPollMilliseconds = 50;
 
@@ -38,8 +38,7 @@ public:
     void findClocks(std::uint16_t timeoutMs, tStatus& status);
     void findClocksInDefaultDomain(std::uint16_t timeoutMs, tStatus& status) override;
     std::uint16_t clockCount() const override;
-    void copyClockProxies(iPTPClockProxy** proxies, std::uint16_t count,
-                          tStatus& status) override;
+    void copyClockProxies(iPTPClockProxy** proxies, std::uint16_t count, tStatus& status) override;
     iPTPClockProxy* findClock(const tClockKey& key, tStatus& status) override;
     void removeClock(iPTPClockProxy* proxy, tStatus& status) override;
     void open(tStatus& status) override;
@@ -58,7 +57,7 @@ public:
     const nQVPTP000::tPortIdentity& getPortIdentity() const { return portIdentity_; }
     const tMgmtMsgTransceiver& getTransceiver() const { return transceiver_; }
 
-private:
+  private:
     using tDescription = std::shared_ptr<nQVPTP000::tManagementMessage>;
 
     std::unique_ptr<nQVPTP000::tManagementMessage> discoveryRequest(tStatus& status) const;
