@@ -87,12 +87,20 @@ std::uint16_t tMgmtMsgTransceiver::sendRequest(tManagementMessage& message, tSta
     }
     if (status.succeeded()) {
         ++nextSequenceId_;
+        // Awaited before it goes out: a clock may answer before sendGeneralMessage returns,
+        // and the receive thread must not drop that answer as unasked for.
+        {
+            nQVTARN000::tMutex::tGuard pending(pendingLock_, status);
+            if (status.succeeded()) {
+                pendingSequenceIds_.push_back(sequenceId);
+            }
+        }
         tProtocolDataUnit unit(status);
         message.serialize(unit, status);
         transport_->sendGeneralMessage(unit, status);
-        if (status.succeeded()) {
-            nQVTARN000::tMutex::tGuard pending(pendingLock_, status);
-            pendingSequenceIds_.push_back(sequenceId);
+        if (status.failed()) {
+            tStatus scratch;
+            cancelRequest(sequenceId, scratch);
         }
     }
     return sequenceId;
