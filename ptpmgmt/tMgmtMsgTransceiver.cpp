@@ -166,6 +166,12 @@ void tMgmtMsgTransceiver::awaitArrival(std::uint64_t seen, tClock::time_point de
     arrived_.wait_until(guard, deadline, [&] { return arrivals_ != seen; });
 }
 
+std::size_t tMgmtMsgTransceiver::storedResponseCount() const {
+    tStatus status;
+    nQVTARN000::tMutex::tGuard guard(responsesLock_, status);
+    return responses_.size();
+}
+
 tStatus tMgmtMsgTransceiver::lastReceiveError() const {
     std::lock_guard<std::mutex> guard(receiveErrorLock_);
     return lastReceiveError_;

@@ -67,6 +67,8 @@ class tMgmtMsgTransceiver final : public nQVTARN000::iThread {
     std::uint64_t receiveErrorCount() const { return receiveErrors_.load(); }
     tStatus lastReceiveError() const;
     bool isRunning() const { return running_.load(); }
+    // Answers stored and not yet taken (for tests that watch the store stay bounded).
+    std::size_t storedResponseCount() const;
 
   private:
     bool matches(const nQVPTP000::tPTPMessage& message, tStatus& status) const;
@@ -85,7 +87,7 @@ class tMgmtMsgTransceiver final : public nQVTARN000::iThread {
     // Answers not yet taken, in arrival order per sequence id; guarded by responsesLock_.
     std::multimap<std::uint16_t, std::unique_ptr<nQVPTP000::tManagementMessage>> responses_;
     std::vector<std::uint16_t> pendingSequenceIds_;  // guarded by pendingLock_
-    nQVTARN000::tMutex responsesLock_;
+    mutable nQVTARN000::tMutex responsesLock_;
     nQVTARN000::tMutex pendingLock_;
 
     mutable std::mutex arrivalLock_;

@@ -112,6 +112,9 @@ class tPTPClockProxy final : public iPTPClockProxy {
     // Used by the node when a later discovery brings a newer description of this port.
     void setCachedDescription(tDescription description);
     std::uint8_t getDomainNumber() const { return domainNumber_.load(); }
+    // Only the client's own tests call this, to keep failing exchanges short; in use every
+    // exchange waits kTimeoutMs.
+    void setExchangeTimeout(std::uint16_t timeoutMs) { timeout_ = timeoutMs; }
 
   private:
     std::unique_ptr<nQVPTP000::tManagementMessage> exchange(
