@@ -89,10 +89,18 @@ std::uint16_t tMgmtMsgTransceiver::sendRequest(tManagementMessage& message, tSta
         ++nextSequenceId_;
         tProtocolDataUnit unit(status);
         message.serialize(unit, status);
-        transport_->sendGeneralMessage(unit, status);
+        // The id is awaited before the datagram leaves: a clock on the same link answers
+        // within a fraction of a millisecond, often before sendto has even returned here.
         if (status.succeeded()) {
             nQVTARN000::tMutex::tGuard pending(pendingLock_, status);
-            pendingSequenceIds_.push_back(sequenceId);
+            if (status.succeeded()) {
+                pendingSequenceIds_.push_back(sequenceId);
+            }
+        }
+        transport_->sendGeneralMessage(unit, status);
+        if (status.failed()) {
+            tStatus scratch;
+            cancelRequest(sequenceId, scratch);
         }
     }
     return sequenceId;
