@@ -70,9 +70,10 @@ long pmcNumber(const std::string& text) {
 }
 
 std::map<std::string, std::string> pmcGet(const TestNetwork& network, const TestClock& clock,
-                                          const std::string& managementId) {
+                                          const std::string& managementId, int domain) {
+    const int asked = domain < 0 ? clock.domain : domain;
     const CommandResult result = network.runInClient(
-        "pmc -4 -i br0 -b 0 -d " + std::to_string(clock.domain) + " 'GET " + managementId + "'");
+        "pmc -4 -i br0 -b 0 -d " + std::to_string(asked) + " 'GET " + managementId + "'");
     std::map<std::string, std::string> values;
     std::istringstream lines(result.output);
     std::string line;

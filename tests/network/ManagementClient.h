@@ -54,9 +54,10 @@ nQVPTPMGMT000::tClockKey clockKeyOf(const TestClock& clock);
 
 // pmc's answer to one GET, as "name value" pairs ("priority1" -> "128"); empty when the
 // clock did not answer. Runs "pmc -4 -i br0 -b 0 -d DOMAIN 'GET ID'" in the client
-// namespace and keeps the lines of the answer of `clock`.
+// namespace (DOMAIN the clock's own unless `domain` is given) and keeps the lines of the
+// answer of `clock`.
 std::map<std::string, std::string> pmcGet(const TestNetwork& network, const TestClock& clock,
-                                          const std::string& managementId);
+                                          const std::string& managementId, int domain = -1);
 
 // pmc's text of a port identity, "020000.fffe.000001-1"; of a clock identity without "-N".
 std::string pmcClockIdentity(const std::array<std::uint8_t, 8>& identity);
