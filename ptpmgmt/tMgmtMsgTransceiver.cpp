@@ -1,6 +1,7 @@
 #include "ptpmgmt/tMgmtMsgTransceiver.h"
 
 #include <algorithm>
+#include <new>
 #include <thread>
 
 #include "ptp/tMessageHeader.h"
@@ -87,16 +88,20 @@ std::uint16_t tMgmtMsgTransceiver::sendRequest(tManagementMessage& message, tSta
     }
     if (status.succeeded()) {
         ++nextSequenceId_;
-        tProtocolDataUnit unit(status);
-        message.serialize(unit, status);
-        // The id is awaited before the datagram leaves: a clock on the same link answers
-        // within a fraction of a millisecond, often before sendto has even returned here.
-        if (status.succeeded()) {
+        // Awaited before it goes out: a clock may answer before sendGeneralMessage returns,
+        // and the receive thread must not drop that answer as unasked for.
+        {
             nQVTARN000::tMutex::tGuard pending(pendingLock_, status);
             if (status.succeeded()) {
-                pendingSequenceIds_.push_back(sequenceId);
+                try {
+                    pendingSequenceIds_.push_back(sequenceId);
+                } catch (const std::bad_alloc&) {
+                    QV_STATUS_SET(status, kStatusNoMemory, kComponentMgmt);
+                }
             }
         }
+        tProtocolDataUnit unit(status);
+        message.serialize(unit, status);
         transport_->sendGeneralMessage(unit, status);
         if (status.failed()) {
             tStatus scratch;
@@ -197,7 +202,11 @@ void tMgmtMsgTransceiver::store(std::unique_ptr<tManagementMessage> message, tSt
             return;
         }
         const std::uint16_t sequenceId = message->getHeader()->getSequenceId();
-        responses_.emplace(sequenceId, std::move(message));
+        try {
+            responses_.emplace(sequenceId, std::move(message));
+        } catch (const std::bad_alloc&) {
+            return;  // lost like a dropped datagram: its exchange times out
+        }
     }
     {
         std::lock_guard<std::mutex> guard(arrivalLock_);
