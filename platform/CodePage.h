@@ -1,0 +1,43 @@
+#ifndef QV_PLATFORM_CODEPAGE_H
+#define QV_PLATFORM_CODEPAGE_H
+
+#include <cstdint>
+#include <string>
+#include <string_view>
+
+#include "platform/BStr.h"
+
+namespace qv::dsc {
+
+// Conversion between wide text (UTF-16, see BStr.h) and narrow text in a character set
+// named by a locale name. Three names are known, matched exactly, case included:
+//   ""          the character set of the process's current locale (LC_CTYPE, as the
+//               process has set it; the library never changes the locale), code page 0;
+//   "US-ASCII"  ASCII, code page 20127;
+//   "cp932"     the Japanese double-byte set CP932, code page 932.
+// Any other name throws qv::dsc::exception::InvalidLocale.
+class CodePage {
+  public:
+    static constexpr std::uint32_t kCurrentLocale = 0;
+    static constexpr std::uint32_t kUsAscii = 20127;
+    static constexpr std::uint32_t kJapanese = 932;
+
+    static std::uint32_t idOf(std::string_view localeName);
+
+    // A character that the narrow set cannot represent becomes '?'. Wide text that is not
+    // valid UTF-16 (a lone surrogate) throws qv::dsc::osdep::WinError.
+    static std::string wideToAnsi(std::u16string_view text, std::string_view localeName);
+    // Narrow text that is not valid in its set throws qv::dsc::osdep::WinError.
+    static std::u16string ansiToWide(std::string_view text, std::string_view localeName);
+};
+
+inline std::string WideToAnsi(std::u16string_view text, std::string_view localeName) {
+    return CodePage::wideToAnsi(text, localeName);
+}
+inline std::u16string AnsiToWide(std::string_view text, std::string_view localeName) {
+    return CodePage::ansiToWide(text, localeName);
+}
+
+}  // namespace qv::dsc
+
+#endif

@@ -1,0 +1,285 @@
+#include "ptp/transport/tUDPNetworkInterface.h"
+
+#include <arpa/inet.h>
+#include <poll.h>
+#include <sys/eventfd.h>
+#include <sys/socket.h>
+#include <unistd.h>
+
+#include <cerrno>
+#include <cstring>
+
+namespace nQVPTP000 {
+
+namespace {
+
+constexpr std::uint8_t kCompatibilityBit = 0x10;
+constexpr std::uint8_t kAnnounceType = 0xB;
+
+int newUdpSocket(int extraFlags) {
+    return socket(AF_INET, SOCK_DGRAM | SOCK_CLOEXEC | extraFlags, IPPROTO_UDP);
+}
+
+template <typename T>
+bool setOption(int fd, int level, int name, const T& value) {
+    return setsockopt(fd, level, name, &value, sizeof(value)) == 0;
+}
+
+void closeIfValid(std::atomic<int>& fd) {
+    const int old = fd.exchange(-1);
+    if (old >= 0) {
+        ::close(old);
+    }
+}
+
+}  // namespace
+
+// Counts a running receive so that close waits for it to leave.
+class tUDPNetworkInterface::tReceiveScope {
+  public:
+    explicit tReceiveScope(tUDPNetworkInterface& owner) : owner_(owner) {
+        const std::lock_guard<std::mutex> guard(owner_.receiveLock_);
+        ++owner_.activeReceives_;
+    }
+    ~tReceiveScope() {
+        const std::lock_guard<std::mutex> guard(owner_.receiveLock_);
+        --owner_.activeReceives_;
+        owner_.receiveIdle_.notify_all();
+    }
+    tReceiveScope(const tReceiveScope&) = delete;
+    tReceiveScope& operator=(const tReceiveScope&) = delete;
+
+  private:
+    tUDPNetworkInterface& owner_;
+};
+
+tUDPNetworkInterface::tUDPNetworkInterface() {
+    destination_.sin_family = AF_INET;
+    destination_.sin_addr.s_addr = inet_addr(kMulticastGroup);
+}
+
+tUDPNetworkInterface::~tUDPNetworkInterface() {
+    closeSockets();
+    closeIfValid(wakeEvent_);
+}
+
+void tUDPNetworkInterface::open(tStatus& status) {
+    stopRequested_ = false;
+    if (status.failed()) {
+        return;
+    }
+    closeSockets();  // a second open without close starts afresh instead of leaking
+    if (wakeEvent_.load() < 0) {
+        wakeEvent_ = eventfd(0, EFD_CLOEXEC | EFD_NONBLOCK);
+        if (wakeEvent_.load() < 0) {
+            QV_STATUS_SET(status, kStatusOsObjectError, kComponentCodec);
+            return;
+        }
+    }
+    sendSocket_ = newUdpSocket(0);
+    if (sendSocket_.load() < 0) {
+        QV_STATUS_SET(status, kStatusOsObjectError, kComponentCodec);
+        return;
+    }
+    in_addr outgoing{};
+    outgoing.s_addr = localInterfaceAddress_;
+    if (!setOption(sendSocket_.load(), IPPROTO_IP, IP_MULTICAST_IF, outgoing)) {
+        QV_STATUS_SET(status, kStatusSocketError, kComponentCodec);
+        return;
+    }
+    eventSocket_ = openReceiveSocket(kEventPort, status);
+    generalSocket_ = openReceiveSocket(kGeneralPort, status);
+}
+
+int tUDPNetworkInterface::openReceiveSocket(std::uint16_t port, tStatus& status) {
+    if (status.failed()) {
+        return -1;
+    }
+    // Non-blocking: a receive only reads what poll has announced, and never hangs in recv.
+    const int fd = newUdpSocket(SOCK_NONBLOCK);
+    if (fd < 0) {
+        QV_STATUS_SET(status, kStatusOsObjectError, kComponentCodec);
+        return -1;
+    }
+    sockaddr_in local{};
+    local.sin_family = AF_INET;
+    local.sin_port = htons(port);
+    local.sin_addr.s_addr = localInterfaceAddress_;
+    ip_mreq membership{};
+    membership.imr_multiaddr = destination_.sin_addr;
+    membership.imr_interface.s_addr = localInterfaceAddress_;
+    // The larger buffer is a wish, not a need: beyond the system's limit only a privileged
+    // process may go (SO_RCVBUFFORCE), and a smaller buffer still works.
+    if (!setOption(fd, SOL_SOCKET, SO_RCVBUFFORCE, kReceiveBufferOctets)) {
+        setOption(fd, SOL_SOCKET, SO_RCVBUF, kReceiveBufferOctets);
+    }
+    if (!setOption(fd, SOL_SOCKET, SO_REUSEADDR, 1) ||
+        bind(fd, reinterpret_cast<const sockaddr*>(&local), sizeof(local)) != 0 ||
+        !setOption(fd, IPPROTO_IP, IP_ADD_MEMBERSHIP, membership)) {
+        QV_STATUS_SET(status, kStatusSocketError, kComponentCodec);
+    }
+    return fd;  // kept, like every socket of a failed open, until close
+}
+
+void tUDPNetworkInterface::close(tStatus&) {
+    padEventMessages_ = false;
+    std::unique_lock<std::mutex> guard(receiveLock_);
+    closing_ = true;
+    wake();
+    receiveIdle_.wait(guard, [this] { return activeReceives_ == 0; });
+    closeSockets();
+    closing_ = false;
+}
+
+void tUDPNetworkInterface::closeSockets() {
+    closeIfValid(sendSocket_);
+    closeIfValid(eventSocket_);
+    closeIfValid(generalSocket_);
+}
+
+void tUDPNetworkInterface::sendEventMessage(tProtocolDataUnit& unit, tStatus& status) {
+    if (status.failed()) {
+        return;
+    }
+    if (padEventMessages_) {
+        while (status.succeeded() && unit.getLength() < kCompatibilityLength) {
+            unit.writeOctet(0, status);
+        }
+    }
+    sendTo(kEventPort, unit, status);
+}
+
+void tUDPNetworkInterface::sendGeneralMessage(tProtocolDataUnit& unit, tStatus& status) {
+    if (status.failed()) {
+        return;
+    }
+    sendTo(kGeneralPort, unit, status);
+}
+
+void tUDPNetworkInterface::sendTo(std::uint16_t port, const tProtocolDataUnit& unit,
+                                  tStatus& status) {
+    if (status.failed()) {
+        return;
+    }
+    sockaddr_in target = destination_;
+    target.sin_port = htons(port);
+    if (sendto(sendSocket_.load(), unit.getBuffer(), unit.getLength(), 0,
+               reinterpret_cast<const sockaddr*>(&target), sizeof(target)) < 0) {
+        QV_STATUS_SET(status, kStatusSocketError, kComponentCodec);
+    }
+}
+
+void tUDPNetworkInterface::abortReceive(tStatus&) {
+    stopRequested_ = true;
+    wake();
+}
+
+bool tUDPNetworkInterface::reportAbort(tStatus& status) {
+    if (!stopRequested_.exchange(false)) {
+        return false;
+    }
+    QV_STATUS_SET(status, kStatusAborted, kComponentCodec);
+    return true;
+}
+
+void tUDPNetworkInterface::receive(tProtocolDataUnit& unit, tStatus& status) {
+    unit.reset();
+    if (status.failed() || reportAbort(status)) {
+        return;
+    }
+    const tReceiveScope scope(*this);
+    int readySocket = -1;
+    if (!awaitDatagram(readySocket, status)) {
+        return;
+    }
+    std::uint8_t buffer[kMaxDatagram];
+    for (;;) {
+        // MSG_TRUNC answers the datagram's full length, so an oversized one is noticed
+        // instead of being cut silently; it is consumed either way.
+        const ssize_t length = recv(readySocket, buffer, sizeof(buffer), MSG_TRUNC);
+        if (reportAbort(status)) {
+            return;  // a datagram read in this pass is dropped
+        }
+        if (length < 0 && (errno == EAGAIN || errno == EINTR)) {
+            if (!awaitDatagram(readySocket, status)) {
+                return;
+            }
+            continue;
+        }
+        if (length < 0 || static_cast<std::size_t>(length) > kMaxDatagram) {
+            QV_STATUS_SET(status, kStatusSocketError, kComponentCodec);
+            return;
+        }
+        if (length > 0) {
+            noteCompatibility(buffer[0], readySocket == eventSocket_.load());
+        }
+        unit.writeOctets(buffer, static_cast<std::size_t>(length), status);
+        return;
+    }
+}
+
+// Waits in steps of half a second until a receive socket is readable (the event socket
+// wins when both are), an abort is requested or the interface is closed.
+bool tUDPNetworkInterface::awaitDatagram(int& readySocket, tStatus& status) {
+    const int event = eventSocket_.load();
+    const int general = generalSocket_.load();
+    for (;;) {
+        if (reportAbort(status)) {
+            return false;
+        }
+        if (closing_ || event < 0 || general < 0) {
+            // Not open, or being closed: there is nothing to wait on.
+            QV_STATUS_SET(status, kStatusOsObjectError, kComponentCodec);
+            return false;
+        }
+        pollfd waiting[3] = {{event, POLLIN, 0}, {general, POLLIN, 0}, {wakeEvent_, POLLIN, 0}};
+        const int ready = poll(waiting, 3, kWaitStepMilliseconds);
+        if (ready < 0 && errno != EINTR) {
+            if (!reportAbort(status)) {
+                QV_STATUS_SET(status, kStatusOsObjectError, kComponentCodec);
+            }
+            return false;
+        }
+        if (ready <= 0) {
+            continue;
+        }
+        if (waiting[2].revents != 0) {
+            drainWake();
+        }
+        if (waiting[0].revents != 0 || waiting[1].revents != 0) {
+            readySocket = waiting[0].revents != 0 ? event : general;
+            return true;
+        }
+    }
+}
+
+void tUDPNetworkInterface::noteCompatibility(std::uint8_t firstOctet, bool eventPort) {
+    const bool flagged = (firstOctet & kCompatibilityBit) != 0;
+    if (flagged && (eventPort || (firstOctet & 0x0F) == kAnnounceType)) {
+        padEventMessages_ = true;
+    }
+}
+
+void tUDPNetworkInterface::wake() {
+    const int fd = wakeEvent_.load();
+    if (fd >= 0) {
+        const std::uint64_t one = 1;
+        // A full counter already means "wake up"; nothing to do about a failure.
+        [[maybe_unused]] const ssize_t written = write(fd, &one, sizeof(one));
+    }
+}
+
+void tUDPNetworkInterface::drainWake() {
+    std::uint64_t count = 0;
+    [[maybe_unused]] const ssize_t got = read(wakeEvent_.load(), &count, sizeof(count));
+}
+
+tPortAddress tUDPNetworkInterface::getPortAddress() {
+    constexpr std::uint16_t kUdpIpv4 = 1;
+    std::uint8_t address[4];
+    std::memcpy(address, &destination_.sin_addr.s_addr, sizeof(address));  // network order
+    tStatus unused;                                                        // four octets always fit
+    return tPortAddress(kUdpIpv4, sizeof(address), address, unused);
+}
+
+}  // namespace nQVPTP000

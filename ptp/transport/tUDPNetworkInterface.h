@@ -1,0 +1,82 @@
+#ifndef QV_PTP_TRANSPORT_TUDPNETWORKINTERFACE_H
+#define QV_PTP_TRANSPORT_TUDPNETWORKINTERFACE_H
+
+#include <netinet/in.h>
+
+#include <atomic>
+#include <condition_variable>
+#include <cstdint>
+#include <mutex>
+
+#include "ptp/transport/iPTPPortMessaging.h"
+
+namespace nQVPTP000 {
+
+// PTP over UDP on IPv4 multicast: one socket sends to the group 224.0.1.129, two sockets
+// bound to the event port 319 and the general port 320 receive, both members of the group.
+// Other processes may bind the same ports at the same time.
+//
+// Threads: `receive` runs on one thread; sends, `abortReceive` and `close` may come from
+// others. `close` wakes a running receive and waits until it has left before the sockets
+// are closed, so a receive never touches a descriptor that has been closed (and perhaps
+// reused by someone else).
+class tUDPNetworkInterface final : public iPTPPortMessaging {
+  public:
+    static constexpr const char* kMulticastGroup = "224.0.1.129";
+    static constexpr const char* kPeerDelayMulticastGroup = "224.0.0.107";  // never joined
+    static constexpr std::uint16_t kEventPort = 319;
+    static constexpr std::uint16_t kGeneralPort = 320;
+    static constexpr std::size_t kMaxDatagram = 1024;
+    static constexpr int kWaitStepMilliseconds = 500;
+    static constexpr std::uint64_t kCompatibilityLength = 124;
+    // Room in the kernel for a burst of answers (a thousand clocks answering one discovery)
+    // while the receive thread decodes.
+    static constexpr int kReceiveBufferOctets = 4 * 1024 * 1024;
+
+    tUDPNetworkInterface();
+    ~tUDPNetworkInterface() override;
+    tUDPNetworkInterface(const tUDPNetworkInterface&) = delete;
+    tUDPNetworkInterface& operator=(const tUDPNetworkInterface&) = delete;
+
+    void open(tStatus& status) override;
+    void close(tStatus& status) override;
+    // In compatibility mode the unit is first padded with zero octets to 124 octets.
+    void sendEventMessage(tProtocolDataUnit& unit, tStatus& status) override;
+    void sendGeneralMessage(tProtocolDataUnit& unit, tStatus& status) override;
+    // A datagram longer than 1024 octets is consumed and gives -52003.
+    void receive(tProtocolDataUnit& unit, tStatus& status) override;
+    void abortReceive(tStatus& status) override;
+    tPortAddress getPortAddress() override;
+
+    bool isCompatibilityMode() const { return padEventMessages_.load(); }
+
+  private:
+    class tReceiveScope;
+
+    int openReceiveSocket(std::uint16_t port, tStatus& status);
+    void sendTo(std::uint16_t port, const tProtocolDataUnit& unit, tStatus& status);
+    bool awaitDatagram(int& readySocket, tStatus& status);
+    bool reportAbort(tStatus& status);
+    void noteCompatibility(std::uint8_t firstOctet, bool eventPort);
+    void wake();
+    void drainWake();
+    void closeSockets();
+
+    std::atomic<int> eventSocket_{-1};
+    std::atomic<int> generalSocket_{-1};
+    std::atomic<int> sendSocket_{-1};
+    sockaddr_in destination_{};  // the group; each send copies it and sets its port
+    std::atomic<bool> stopRequested_{false};
+    std::uint32_t localInterfaceAddress_ = 0;  // network byte order; 0 is any interface
+    std::atomic<bool> padEventMessages_{false};
+    std::atomic<int> wakeEvent_{-1};  // an eventfd that abortReceive and close signal
+
+    std::mutex receiveLock_;  // guards activeReceives_ and closing_
+    std::condition_variable receiveIdle_;
+    int activeReceives_ = 0;
+    std::atomic<bool> closing_{false};
+};
+
+}  // namespace nQVPTP000
+
+#endif

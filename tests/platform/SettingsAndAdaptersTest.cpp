@@ -1,0 +1,79 @@
+#include <gtest/gtest.h>
+#include <stdlib.h>
+
+#include <filesystem>
+#include <fstream>
+#include <string>
+
+#include "platform/EthernetAdapters.h"
+#include "platform/FindClocksTimeout.h"
+#include "platform/SettingsStore.h"
+
+using qv::dsc::osdep::EthernetAdapters;
+using qv::dsc::osdep::FindClocksTimeout;
+using qv::dsc::osdep::SettingsStore;
+
+namespace {
+
+class SettingsTest : public ::testing::Test {
+  protected:
+    void SetUp() override {
+        char pattern[] = "/tmp/qv-settings-XXXXXX";
+        ASSERT_NE(mkdtemp(pattern), nullptr);
+        root_ = pattern;
+        setenv(SettingsStore::kRootVariable, root_.c_str(), 1);
+    }
+    void TearDown() override {
+        unsetenv(SettingsStore::kRootVariable);
+        std::filesystem::remove_all(root_);
+    }
+    void store(const std::string& text) {
+        const std::filesystem::path folder = root_ + "/Software/Quarvel/Corbel/qv-1588";
+        std::filesystem::create_directories(folder);
+        std::ofstream(folder / "findClocksTimeout") << text;
+    }
+
+    std::string root_;
+};
+
+}  // namespace
+
+TEST_F(SettingsTest, KeyPathBecomesAFolderUnderTheRoot) {
+    EXPECT_EQ(SettingsStore(FindClocksTimeout::kKeyPath).folder(),
+              root_ + "/Software/Quarvel/Corbel/qv-1588");
+    EXPECT_EQ(SettingsStore("..\\..\\etc").folder(), root_ + "/etc");
+}
+
+TEST_F(SettingsTest, AbsentValueGivesTheDefault) {
+    EXPECT_EQ(FindClocksTimeout::read(), 1000);
+}
+
+TEST_F(SettingsTest, StoredNumberIsUsedWithItsLow16Bits) {
+    store("2500\n");
+    EXPECT_EQ(FindClocksTimeout::read(), 2500);
+    store("70000");  // 0x11170
+    EXPECT_EQ(FindClocksTimeout::read(), 0x1170);
+    store(" 0x1F4 ");
+    EXPECT_EQ(FindClocksTimeout::read(), 500);
+}
+
+TEST_F(SettingsTest, TextThatIsNoNumberGivesTheDefault) {
+    for (const char* text : {"", "abc", "12ms", "-5", "4294967296", "0x"}) {
+        store(text);
+        EXPECT_EQ(FindClocksTimeout::read(), 1000) << text;
+    }
+    const SettingsStore key(FindClocksTimeout::kKeyPath);
+    EXPECT_FALSE(key.readNumber("../qv-1588/findClocksTimeout").has_value());
+}
+
+TEST(EthernetAdaptersTest, ClockIdentityIsEui64OfTheAddress) {
+    const EthernetAdapters::tMacAddress mac = {0x02, 0x11, 0x22, 0x33, 0x44, 0x55};
+    const EthernetAdapters::tClockIdentity expected = {0x02, 0x11, 0x22, 0xFF,
+                                                       0xFE, 0x33, 0x44, 0x55};
+    EXPECT_EQ(EthernetAdapters::clockIdentityOf(mac), expected);
+}
+
+TEST(EthernetAdaptersTest, NoAdapterGivesTheFixedIdentity) {
+    const EthernetAdapters::tClockIdentity expected = {'Q', 'V', 'P', 'T', 'P', 'C', 'L', 'K'};
+    EXPECT_EQ(EthernetAdapters::clockIdentityOf(std::nullopt), expected);
+}

@@ -1,0 +1,103 @@
+#include <gtest/gtest.h>
+
+#include <string>
+
+#include "platform/CodePage.h"
+#include "platform/InvalidLocale.h"
+#include "platform/StringBase.h"
+#include "platform/WinError.h"
+
+using qv::dsc::CodePage;
+using qv::dsc::String;
+using qv::dsc::WString;
+using qv::dsc::exception::InvalidLocale;
+using qv::dsc::osdep::WinError;
+
+TEST(StringBaseTest, ShortTextIntoFullEnoughBufferKeepsIt) {
+    String text("0123456789abcdef");  // capacity 16
+    ASSERT_EQ(text.capacity(), 16U);
+    const char* before = text.c_str();
+    text = "0123456789";
+    EXPECT_EQ(text.c_str(), before);
+    EXPECT_EQ(text.capacity(), 16U);
+    EXPECT_EQ(text.length(), 10U);
+    EXPECT_STREQ(text.c_str(), "0123456789");
+}
+
+TEST(StringBaseTest, ShortTextIntoMostlyEmptyBufferReplacesIt) {
+    String text("0123456789abcdef0123456789abcdef");  // capacity 32
+    text = "0123456789";
+    EXPECT_EQ(text.capacity(), 10U);  // exactly the new length
+    EXPECT_STREQ(text.c_str(), "0123456789");
+}
+
+TEST(StringBaseTest, LongerTextGrowsToExactlyItsLength) {
+    String text("abc");
+    text = "abcdefgh";
+    EXPECT_EQ(text.capacity(), 8U);
+    EXPECT_STREQ(text.c_str(), "abcdefgh");
+}
+
+TEST(StringBaseTest, NullEmptyCopyAndSelfAssignment) {
+    const String none(static_cast<const char*>(nullptr));
+    EXPECT_TRUE(none.empty());
+    EXPECT_STREQ(none.c_str(), "");
+    String text("clock");
+    const String copy(text);
+    EXPECT_NE(copy.c_str(), text.c_str());
+    EXPECT_EQ(copy, text);
+    text.assign(text.c_str() + 1, 3);  // a source inside its own buffer
+    EXPECT_STREQ(text.c_str(), "loc");
+    const char range[] = "xyz";
+    EXPECT_STREQ(String(range, range + 2).c_str(), "xy");
+}
+
+TEST(StringBaseTest, OtherWidthConvertsThroughTheCurrentLocale) {
+    const WString wide(String("PTP clock"));
+    EXPECT_EQ(std::u16string(wide.view()), u"PTP clock");
+    EXPECT_STREQ(String(wide).c_str(), "PTP clock");
+}
+
+TEST(CodePageTest, KnownNamesAreMatchedExactly) {
+    EXPECT_EQ(CodePage::idOf(""), 0U);
+    EXPECT_EQ(CodePage::idOf("US-ASCII"), 20127U);
+    EXPECT_EQ(CodePage::idOf("cp932"), 932U);
+    for (const char* name : {"CP932", "us-ascii", "UTF-8", "cp932 "}) {
+        try {
+            CodePage::idOf(name);
+            ADD_FAILURE() << name;
+        } catch (const InvalidLocale& e) {
+            EXPECT_EQ(e.errorCode(), 0x8ABC7024u);
+            EXPECT_STREQ(e.file(), "_GetCodePageID");
+            EXPECT_EQ(e.line(), 58U);
+        }
+    }
+    EXPECT_THROW(qv::dsc::WideToAnsi(u"x", "CP932"), InvalidLocale);
+}
+
+TEST(CodePageTest, JapaneseTextRoundTripsThroughCp932) {
+    // "日本語 1588": Shift_JIS double-byte codes 93FA 967B 8CEA, then ASCII.
+    const std::u16string japanese = u"\u65E5\u672C\u8A9E 1588";
+    const std::string expected = "\x93\xFA\x96\x7B\x8C\xEA 1588";
+    const std::string narrow = qv::dsc::WideToAnsi(japanese, "cp932");
+    EXPECT_EQ(narrow, expected);
+    EXPECT_EQ(qv::dsc::AnsiToWide(narrow, "cp932"), japanese);
+}
+
+TEST(CodePageTest, UnrepresentableCharacterBecomesQuestionMark) {
+    // U+65E5 and the pair D83D DE00 (one character outside the basic plane) are not ASCII.
+    EXPECT_EQ(qv::dsc::WideToAnsi(u"a\u65E5b\U0001F600c", "US-ASCII"), "a?b?c");
+}
+
+TEST(CodePageTest, MalformedInputThrowsWinError) {
+    const char16_t loneSurrogate[] = {u'a', 0xD800, u'b'};
+    EXPECT_THROW(qv::dsc::WideToAnsi(std::u16string_view(loneSurrogate, 3), "cp932"), WinError);
+    // 0x81 opens a double-byte code that never comes.
+    EXPECT_THROW(qv::dsc::AnsiToWide("ab\x81", "cp932"), WinError);
+    EXPECT_THROW(qv::dsc::AnsiToWide("\xC3", "US-ASCII"), WinError);
+}
+
+TEST(CodePageTest, EmptyTextGivesEmptyResult) {
+    EXPECT_EQ(qv::dsc::WideToAnsi(u"", "cp932"), "");
+    EXPECT_EQ(qv::dsc::AnsiToWide("", ""), u"");
+}

@@ -1,0 +1,155 @@
+#include "tests/support/TestNetwork.h"
+
+#include <sys/wait.h>
+#include <unistd.h>
+
+#include <atomic>
+#include <cstdio>
+#include <map>
+#include <sstream>
+
+namespace qvtest {
+
+namespace {
+
+// 1 to 8 characters: "q", the process id and a counter in base 36, so that runs of
+// parallel test programs and several networks of one program differ.
+std::string uniquePrefix() {
+    static std::atomic<unsigned> counter{0};
+    const char* digits = "0123456789abcdefghijklmnopqrstuvwxyz";
+    auto pid = static_cast<unsigned long>(getpid());
+    std::string pidText;
+    do {
+        pidText.insert(pidText.begin(), digits[pid % 36]);
+        pid /= 36;
+    } while (pid != 0);
+    const unsigned count = counter++ % (36 * 36);
+    return "q" + pidText.substr(0, 5) + digits[count / 36] + digits[count % 36];
+}
+
+std::string shellQuoted(const std::string& text) {
+    std::string quoted = "'";
+    for (char c : text) {
+        quoted += c == '\'' ? std::string("'\\''") : std::string(1, c);
+    }
+    return quoted + "'";
+}
+
+std::map<std::string, std::string> layoutWords(const std::string& line) {
+    std::map<std::string, std::string> words;
+    std::istringstream in(line);
+    std::string word;
+    while (in >> word) {
+        const auto equals = word.find('=');
+        if (equals != std::string::npos) {
+            words[word.substr(0, equals)] = word.substr(equals + 1);
+        }
+    }
+    return words;
+}
+
+bool parseIdentity(const std::string& hex, std::array<std::uint8_t, 8>& identity) {
+    if (hex.size() != 16) {
+        return false;
+    }
+    for (std::size_t i = 0; i < identity.size(); ++i) {
+        identity[i] = static_cast<std::uint8_t>(std::stoul(hex.substr(2 * i, 2), nullptr, 16));
+    }
+    return true;
+}
+
+TestClock clockOf(std::map<std::string, std::string>& words) {
+    TestClock clock;
+    clock.index = std::stoi(words["index"]);
+    clock.impl = words["impl"];
+    clock.nameSpace = words["ns"];
+    clock.address = words["addr"];
+    clock.mac = words["mac"];
+    parseIdentity(words["identity"], clock.identity);
+    clock.portNumber = static_cast<std::uint16_t>(std::stoul(words["port"]));
+    clock.domain = static_cast<std::uint8_t>(std::stoul(words["domain"]));
+    clock.priority1 = static_cast<std::uint8_t>(std::stoul(words["prio1"]));
+    clock.priority2 = static_cast<std::uint8_t>(std::stoul(words["prio2"]));
+    clock.description = words["desc"];
+    return clock;
+}
+
+}  // namespace
+
+CommandResult runCommand(const std::string& commandLine) {
+    CommandResult result;
+    FILE* pipe = popen((commandLine + " 2>&1").c_str(), "r");
+    if (pipe == nullptr) {
+        result.output = "cannot start: " + commandLine;
+        return result;
+    }
+    char buffer[4096];
+    std::size_t count = 0;
+    while ((count = fread(buffer, 1, sizeof buffer, pipe)) > 0) {
+        result.output.append(buffer, count);
+    }
+    const int status = pclose(pipe);
+    if (status != -1 && WIFEXITED(status)) {
+        result.exitStatus = WEXITSTATUS(status);
+    }
+    return result;
+}
+
+TestNetwork::TestNetwork(const std::vector<std::string>& clockSpecs) : prefix_(uniquePrefix()) {
+    std::string command = shellQuoted(toolPath()) + " up " + prefix_;
+    for (const auto& spec : clockSpecs) {
+        command += " " + shellQuoted(spec);
+    }
+    started_ = true;
+    const CommandResult result = runCommand(command);
+    if (result.exitStatus != 0) {
+        failure_ = "tools/testnet up " + prefix_ + " failed: " + result.output;
+        return;
+    }
+    up_ = parseLayout(result.output);
+    if (!up_) {
+        failure_ = "unexpected output of tools/testnet up: " + result.output;
+    }
+}
+
+TestNetwork::~TestNetwork() {
+    down();
+}
+
+void TestNetwork::down() {
+    if (started_) {
+        runCommand(shellQuoted(toolPath()) + " down " + prefix_);
+        started_ = false;
+        up_ = false;
+    }
+}
+
+CommandResult TestNetwork::runInClient(const std::string& commandLine) const {
+    return runCommand("ip netns exec " + shellQuoted(clientNamespace_) + " sh -c " +
+                      shellQuoted(commandLine));
+}
+
+std::string TestNetwork::toolPath() {
+    return std::string(QV_SOURCE_DIR) + "/tools/testnet";
+}
+
+bool TestNetwork::parseLayout(const std::string& layout) {
+    std::istringstream lines(layout);
+    std::string line;
+    while (std::getline(lines, line)) {
+        auto words = layoutWords(line);
+        if (line.rfind("client ", 0) == 0) {
+            clientNamespace_ = words["ns"];
+            clientAddress_ = words["addr"];
+        } else if (line.rfind("clock ", 0) == 0) {
+            clocks_.push_back(clockOf(words));
+            const int pid = std::stoi(words["pid"]);
+            if (pid > 0) {
+                processIds_.push_back(pid);
+            }
+        }
+    }
+    return !clientNamespace_.empty();
+}
+
+}  // namespace qvtest
