@@ -5,6 +5,7 @@
 #include "ptp/iManagedClock.h"
 #include "ptp/tManagementIdTable.h"
 #include "tests/ptp/PduTestSupport.h"
+#include "tests/support/ptp/InMemoryManagedClock.h"
 
 using namespace nQVPTP000;
 using qvtest::Datagram;
@@ -86,8 +87,7 @@ TEST(tManagementErrorStatusTLVTest, CutInsideTheFixedFieldsStaysAnError) {
 }
 
 TEST(tManagementMessagePayloadTest, RespondAnswersWithACopyOrAnErrorStatus) {
-    struct : iManagedClock {
-    } clock;  // neither answer reads the clock
+    qvtest::InMemoryManagedClock clock;  // neither answer reads the clock
     tNullManagementTLV null;
     tStatus status;
     auto answer = null.respond(tManagementMessagePayload::kCommand, clock, 1, status);
