@@ -41,7 +41,11 @@ void tManagementErrorStatusTLV::deserializeValue(iSerializableTarget& source, tS
     }
     // The display text and its pad are optional: a TLV that ends before or inside them is
     // still a complete refusal. A TLV cut inside its fixed fields is not.
-    if (status.failed() || getLengthField() <= kFixedLength) {
+    if (status.failed()) {
+        return;
+    }
+    if (getLengthField() <= kFixedLength) {
+        displayData_ = tPTPText();
         return;
     }
     displayData_.deserialize(source, status);
@@ -58,6 +62,11 @@ void tManagementErrorStatusTLV::serializeValue(iSerializableTarget& target, tSta
     target.writeEnumeration16(managementId_, status);
     for (int i = 0; i < 4; ++i) {
         target.writeOctet(0, status);
+    }
+    // A refusal received without a display text is written as it came, so that the octets
+    // written always agree with lengthField.
+    if (getLengthField() <= kFixedLength) {
+        return;
     }
     displayData_.serialize(target, status);
     if (displayData_.getSize() % 2 != 0) {

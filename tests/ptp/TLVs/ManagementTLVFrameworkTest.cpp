@@ -67,6 +67,10 @@ TEST(tManagementErrorStatusTLVTest, DecodesWithoutDisplayData) {
     EXPECT_TRUE(status.succeeded());
     EXPECT_EQ(tlv.getManagementErrorId(), 0x0002);
     EXPECT_EQ(tlv.getManagementId(), 0x2000);
+    EXPECT_EQ(tlv.getDisplayData().getLengthField(), 0);
+    // Written back, it is the 12 octets it came as, in agreement with its lengthField.
+    EXPECT_EQ(encode(tlv), hex("00 02 | 00 08 | 00 02 | 20 00 | 00 00 00 00"));
+    EXPECT_EQ(tlv.getSize(), 12);
 }
 
 TEST(tManagementErrorStatusTLVTest, DisplayDataCutShortIsForgiven) {
