@@ -1,0 +1,248 @@
+#include "ptpmgmt/tPTPMgmtNode.h"
+
+#include <algorithm>
+#include <new>
+#include <thread>
+
+#include "ptp/TLVs/tClockDescriptionTLV.h"
+#include "ptp/tMessageHeader.h"
+#include "ptpmgmt/tPTPClockProxy.h"
+
+namespace nQVPTPMGMT000 {
+
+using nQVPTP000::tManagementMessage;
+using nQVPTP000::tManagementMessagePayload;
+using nQVTARN000::tMutex;
+
+tPTPMgmtNode::tPTPMgmtNode(nQVPTP000::iPTPPortMessaging* transport,
+                           const nQVPTP000::tClockIdentity& clockIdentity, std::uint16_t portNumber,
+                           tStatus& status)
+    : portIdentity_(clockIdentity, portNumber),
+      transceiver_(transport, clockIdentity, portNumber, status) {
+    clockListLock_.create(status);
+    requestLock_.create(status);
+}
+
+tPTPMgmtNode::~tPTPMgmtNode() {
+    tStatus status;
+    tMutex::tGuard guard(clockListLock_, status);
+    clocks_.clear();
+    descriptions_.clear();
+}
+
+void tPTPMgmtNode::open(tStatus& status) {
+    transceiver_.start(status);
+}
+
+void tPTPMgmtNode::close(tStatus& status) {
+    transceiver_.stop(status);
+}
+
+std::unique_ptr<tManagementMessage> tPTPMgmtNode::discoveryRequest(tStatus& status) const {
+    auto request = std::make_unique<tManagementMessage>(status);
+    request->setActionField(tManagementMessagePayload::kGet, status);
+    request->setTargetPortIdentity(nQVPTP000::allOnesPortIdentity(), status);
+    request->setPayload(std::make_unique<nQVPTP000::tClockDescriptionTLV>(), status);
+    if (nQVPTP000::tMessageHeader* header = request->getHeader()) {
+        header->setDomainNumber(0, status);
+        header->setSourcePortIdentity(portIdentity_, status);
+    }
+    return request;
+}
+
+void tPTPMgmtNode::findClocks(std::uint16_t timeoutMs, tStatus& status) {
+    discover(kDiscoveryDomains, timeoutMs, status);
+}
+
+void tPTPMgmtNode::findClocksInDefaultDomain(std::uint16_t timeoutMs, tStatus& status) {
+    discover(1, timeoutMs, status);
+}
+
+// Sends the request in domains 0 .. domains - 1 with consecutive sequence ids, lets the
+// receive thread collect answers for `timeoutMs`, then makes a proxy of every new port.
+void tPTPMgmtNode::discover(std::uint8_t domains, std::uint16_t timeoutMs, tStatus& status) {
+    std::unique_ptr<tManagementMessage> request = discoveryRequest(status);
+    std::vector<std::uint16_t> sent;
+    tMutex::tGuard clockList(clockListLock_, status);
+    {
+        tMutex::tGuard requests(requestLock_, status);
+        for (std::uint8_t domain = 0; domain < domains && status.succeeded(); ++domain) {
+            request->getHeader()->setDomainNumber(domain, status);
+            const std::uint16_t sequenceId = transceiver_.sendRequest(*request, status);
+            if (status.succeeded()) {
+                sent.push_back(sequenceId);
+                if (domains > 1) {
+                    std::this_thread::sleep_for(std::chrono::milliseconds(1));
+                }
+            }
+        }
+    }
+    if (status.succeeded()) {
+        std::this_thread::sleep_for(std::chrono::milliseconds(timeoutMs));
+    }
+    for (std::uint16_t sequenceId : sent) {
+        transceiver_.cancelRequest(sequenceId, status);
+        collect(sequenceId, status);
+    }
+    // A discovery that failed part-way must not leave requests that keep storing answers.
+    for (std::uint16_t sequenceId : sent) {
+        tStatus scratch;
+        transceiver_.retireRequest(sequenceId, scratch);
+    }
+}
+
+// Turns the stored answers to one discovery request into proxies (clockListLock_ held).
+// A port already known keeps its proxy, which now describes itself by the newer answer.
+void tPTPMgmtNode::collect(std::uint16_t sequenceId, tStatus& status) {
+    try {
+        for (std::unique_ptr<tManagementMessage> answer =
+                 transceiver_.takeResponse(sequenceId, status);
+             answer && status.succeeded(); answer = transceiver_.takeResponse(sequenceId, status)) {
+            const tClockKey key = makeClockKey(answer->getHeader()->getSourcePortIdentity());
+            tDescription description(std::move(answer));
+            descriptions_[key] = description;
+            auto known = clocks_.find(key);
+            if (known != clocks_.end()) {
+                known->second->setCachedDescription(description);
+            } else {
+                clocks_.emplace(key,
+                                std::make_unique<tPTPClockProxy>(this, key, description, status));
+                clockCount_.store(static_cast<std::uint16_t>(clocks_.size()));
+            }
+        }
+    } catch (const std::bad_alloc&) {
+        QV_STATUS_SET(status, kStatusNoMemory, kComponentMgmt);
+    }
+}
+
+std::uint16_t tPTPMgmtNode::clockCount() const {
+    return clockCount_.load();
+}
+
+void tPTPMgmtNode::copyClockProxies(iPTPClockProxy** proxies, std::uint16_t count,
+                                    tStatus& status) {
+    tMutex::tGuard guard(clockListLock_, status);
+    if (status.failed()) {
+        return;
+    }
+    if (count != clocks_.size()) {
+        QV_STATUS_SET(status, kStatusNoData, kComponentMgmt);
+        return;
+    }
+    for (const auto& [key, proxy] : clocks_) {
+        *proxies++ = proxy.get();
+    }
+}
+
+iPTPClockProxy* tPTPMgmtNode::findClock(const tClockKey& key, tStatus& status) {
+    if (status.failed()) {
+        return nullptr;
+    }
+    tMutex::tGuard guard(clockListLock_, status);
+    auto found = clocks_.find(key);
+    if (status.succeeded() && found == clocks_.end()) {
+        QV_STATUS_SET(status, kStatusNoData, kComponentMgmt);
+    }
+    return status.succeeded() ? found->second.get() : nullptr;
+}
+
+void tPTPMgmtNode::removeClock(iPTPClockProxy* proxy, tStatus& status) {
+    if (status.failed() || proxy == nullptr) {
+        return;
+    }
+    tMutex::tGuard guard(clockListLock_, status);
+    tClockKey key{};
+    std::copy_n(proxy->getClockKey(), key.size(), key.begin());
+    auto found = clocks_.find(key);
+    if (status.succeeded() && found == clocks_.end()) {
+        QV_STATUS_SET(status, kStatusNoData, kComponentMgmt);
+    }
+    if (status.succeeded()) {
+        clocks_.erase(found);
+        descriptions_.erase(key);
+        clockCount_.store(static_cast<std::uint16_t>(clocks_.size()));
+    }
+}
+
+std::unique_ptr<tManagementMessage> tPTPMgmtNode::sendAndAwait(
+    const nQVPTP000::tPortIdentity& target, std::unique_ptr<tManagementMessagePayload> payload,
+    std::uint32_t actionField, std::uint16_t timeoutMs, std::uint8_t domainNumber,
+    tStatus& status) {
+    tManagementMessage request(status);
+    request.setActionField(actionField, status);
+    request.setTargetPortIdentity(target, status);
+    request.setPayload(std::move(payload), status);
+    if (nQVPTP000::tMessageHeader* header = request.getHeader()) {
+        header->setDomainNumber(domainNumber, status);
+        header->setSourcePortIdentity(portIdentity_, status);
+    }
+    if (status.failed()) {
+        return nullptr;
+    }
+    std::uint16_t sequenceId = 0;
+    {
+        tMutex::tGuard requests(requestLock_, status);
+        sequenceId = transceiver_.sendRequest(request, status);
+    }
+    if (status.failed()) {
+        return nullptr;
+    }
+    std::unique_ptr<tManagementMessage> answer = await(sequenceId, request, timeoutMs, status);
+    tStatus scratch;
+    transceiver_.retireRequest(sequenceId, scratch);
+    return answer;
+}
+
+// Waits for the first answer to `sequenceId`: the caller wakes as soon as one is stored,
+// and gives up once ceil(timeoutMs / 50) steps of 50 ms have passed without one.
+std::unique_ptr<tManagementMessage> tPTPMgmtNode::await(std::uint16_t sequenceId,
+                                                        const tManagementMessage& request,
+                                                        std::uint16_t timeoutMs, tStatus& status) {
+    if (timeoutMs == 0) {
+        QV_STATUS_SET(status, kStatusNoData, kComponentMgmt);
+        return nullptr;
+    }
+    const std::uint32_t steps = (timeoutMs + kPollMilliseconds - 1) / kPollMilliseconds;
+    const auto deadline =
+        tMgmtMsgTransceiver::tClock::now() + std::chrono::milliseconds(steps * kPollMilliseconds);
+    while (status.succeeded()) {
+        const std::uint64_t seen = transceiver_.arrivals();
+        std::unique_ptr<tManagementMessage> answer = transceiver_.takeResponse(sequenceId, status);
+        if (answer) {
+            check(request, answer, status);
+            return answer;
+        }
+        if (status.succeeded() && tMgmtMsgTransceiver::tClock::now() >= deadline) {
+            QV_STATUS_SET(status, kStatusNoData, kComponentMgmt);
+        }
+        if (status.succeeded()) {
+            transceiver_.awaitArrival(seen, deadline);
+        }
+    }
+    return nullptr;
+}
+
+// Judges the first answer; one that fails a check is dropped with -52012.
+void tPTPMgmtNode::check(const tManagementMessage& request,
+                         std::unique_ptr<tManagementMessage>& answer, tStatus& status) {
+    const tManagementMessagePayload* payload = answer->getPayload(status);
+    const tManagementMessagePayload* asked = request.getPayload(status);
+    if (status.failed() || payload == nullptr || asked == nullptr) {
+        answer.reset();
+        return;
+    }
+    const std::uint32_t action = request.getActionField();
+    const std::uint32_t reply = answer->getActionField();
+    const bool pairMatches =
+        ((action == tManagementMessagePayload::kGet || action == tManagementMessagePayload::kSet) &&
+         reply == tManagementMessagePayload::kResponse) ||
+        (action == tManagementMessagePayload::kCommand &&
+         reply == tManagementMessagePayload::kAcknowledge);
+    if (payload->getTlvType() == nQVPTP000::tTLV::kManagementErrorStatus || !pairMatches ||
+        payload->getManagementId() != asked->getManagementId()) {
+        QV_STATUS_SET(status, kStatusNoData, kComponentMgmt);
+        answer.reset();
+    }
+}
+
+}  // namespace nQVPTPMGMT000

@@ -1,0 +1,83 @@
+#ifndef QV_PTPMGMT_TPTPMGMTNODE_H
+#define QV_PTPMGMT_TPTPMGMTNODE_H
+
+#include <atomic>
+#include <cstdint>
+#include <map>
+#include <memory>
+#include <vector>
+
+#include "platform/tMutex.h"
+#include "ptp/tManagementMessage.h"
+#include "ptp/tManagementMessagePayload.h"
+#include "ptpmgmt/iPTPMgmtNode.h"
+#include "ptpmgmt/tMgmtMsgTransceiver.h"
+
+namespace nQVPTPMGMT000 {
+
+class tPTPClockProxy;
+
+// The management node: finds the clocks on the network with a multicast GET of
+// CLOCK_DESCRIPTION, keeps one proxy per answering port, and carries out every
+// request/response exchange that a proxy asks for.
+//
+// Lock order: clockListLock_, then requestLock_, then the transceiver's locks.
+class tPTPMgmtNode final : public iPTPMgmtNode {
+  public:
+    static constexpr std::uint8_t kDiscoveryDomains = 4;
+    static constexpr std::uint32_t kPollMilliseconds = 50;
+
+    tPTPMgmtNode(nQVPTP000::iPTPPortMessaging* transport,
+                 const nQVPTP000::tClockIdentity& clockIdentity, std::uint16_t portNumber,
+                 tStatus& status);
+    ~tPTPMgmtNode() override;
+    tPTPMgmtNode(const tPTPMgmtNode&) = delete;
+    tPTPMgmtNode& operator=(const tPTPMgmtNode&) = delete;
+
+    // Discovery in domains 0 to 3: four requests, then `timeoutMs` of collecting answers.
+    void findClocks(std::uint16_t timeoutMs, tStatus& status);
+    void findClocksInDefaultDomain(std::uint16_t timeoutMs, tStatus& status) override;
+    std::uint16_t clockCount() const override;
+    void copyClockProxies(iPTPClockProxy** proxies, std::uint16_t count, tStatus& status) override;
+    iPTPClockProxy* findClock(const tClockKey& key, tStatus& status) override;
+    void removeClock(iPTPClockProxy* proxy, tStatus& status) override;
+    void open(tStatus& status) override;
+    void close(tStatus& status) override;
+
+    // One checked exchange: sends `payload` (now owned by the request) with `actionField` to
+    // `target` in `domainNumber` and returns the answer, owned by the caller, once it has
+    // passed the checks: no error status, RESPONSE to GET or SET and ACKNOWLEDGE to COMMAND,
+    // the same management id. Fails with -52012 when no answer came within the time-out
+    // (ceil(timeoutMs / 50) steps of 50 ms) or the answer failed a check.
+    std::unique_ptr<nQVPTP000::tManagementMessage> sendAndAwait(
+        const nQVPTP000::tPortIdentity& target,
+        std::unique_ptr<nQVPTP000::tManagementMessagePayload> payload, std::uint32_t actionField,
+        std::uint16_t timeoutMs, std::uint8_t domainNumber, tStatus& status);
+
+    const nQVPTP000::tPortIdentity& getPortIdentity() const { return portIdentity_; }
+    const tMgmtMsgTransceiver& getTransceiver() const { return transceiver_; }
+
+  private:
+    using tDescription = std::shared_ptr<nQVPTP000::tManagementMessage>;
+
+    std::unique_ptr<nQVPTP000::tManagementMessage> discoveryRequest(tStatus& status) const;
+    void discover(std::uint8_t domains, std::uint16_t timeoutMs, tStatus& status);
+    void collect(std::uint16_t sequenceId, tStatus& status);
+    std::unique_ptr<nQVPTP000::tManagementMessage> await(
+        std::uint16_t sequenceId, const nQVPTP000::tManagementMessage& request,
+        std::uint16_t timeoutMs, tStatus& status);
+    void check(const nQVPTP000::tManagementMessage& request,
+               std::unique_ptr<nQVPTP000::tManagementMessage>& response, tStatus& status);
+
+    const nQVPTP000::tPortIdentity portIdentity_;
+    nQVTARN000::tMutex clockListLock_;
+    tMgmtMsgTransceiver transceiver_;
+    nQVTARN000::tMutex requestLock_;
+    std::map<tClockKey, std::unique_ptr<tPTPClockProxy>> clocks_;  // guarded by clockListLock_
+    std::map<tClockKey, tDescription> descriptions_;               // guarded by clockListLock_
+    std::atomic<std::uint16_t> clockCount_{0};  // clocks_.size(), readable without the lock
+};
+
+}  // namespace nQVPTPMGMT000
+
+#endif

@@ -1,0 +1,54 @@
+#ifndef QV_TESTS_NETWORK_BURSTRESPONDER_H
+#define QV_TESTS_NETWORK_BURSTRESPONDER_H
+
+#include <array>
+#include <atomic>
+#include <cstdint>
+#include <string>
+#include <thread>
+#include <vector>
+
+namespace qvtest {
+
+// Many clock ports answering a discovery at once, over real UDP from a network namespace
+// of their own: for scale tests and benchmarks of the management client.
+//
+// Clock c (0 .. clocks-1) has identity 02 5C 00 FF FE 00 c(high) c(low), ports 1 .. ports,
+// and lives in domain c % 4. A GET CLOCK_DESCRIPTION to all clocks and ports in domain d is
+// answered by every port of every clock of that domain, as a burst, each answer the clock
+// description that ptp4l sent (tests/data/corpus) with the answering port's identity, the
+// request's sequence id and domain, addressed to the requester. Nothing else is answered.
+class BurstResponder {
+  public:
+    BurstResponder(std::string nameSpace, std::uint16_t clocks, std::uint16_t ports);
+    ~BurstResponder();
+    BurstResponder(const BurstResponder&) = delete;
+    BurstResponder& operator=(const BurstResponder&) = delete;
+
+    // Starts the answering thread in the namespace; false with `failure` set when it could
+    // not listen there.
+    bool start(std::string& failure);
+    void stop();
+
+    static std::array<std::uint8_t, 8> identityOf(std::uint16_t clock);
+    std::uint64_t answersSent() const { return sent_.load(); }
+
+  private:
+    void run();
+    void answer(const std::uint8_t* request, std::size_t length);
+
+    const std::string nameSpace_;
+    const std::uint16_t clocks_;
+    const std::uint16_t ports_;
+    std::vector<std::uint8_t> template_;
+    int socket_ = -1;
+    std::atomic<bool> stopping_{false};
+    std::atomic<int> ready_{0};  // 1 listening, -1 failed
+    std::string failure_;
+    std::atomic<std::uint64_t> sent_{0};
+    std::thread thread_;
+};
+
+}  // namespace qvtest
+
+#endif

@@ -1,0 +1,239 @@
+#include "ptpmgmt/tMgmtMsgTransceiver.h"
+
+#include <gtest/gtest.h>
+
+#include "ptp/tMessageHeader.h"
+#include "tests/ptpmgmt/ClientTestSupport.h"
+#include "tests/support/FailingAllocation.h"
+#include "tests/support/ptpmgmt/SimulatedNetwork.h"
+
+using nQVPTP000::tManagementMessage;
+using nQVPTP000::tManagementMessagePayload;
+using nQVPTP000::tPortIdentity;
+using nQVPTPMGMT000::tMgmtMsgTransceiver;
+using namespace qvtest;
+
+namespace {
+
+constexpr auto kResponse = tManagementMessagePayload::kResponse;
+
+class tMgmtMsgTransceiverTest : public ::testing::Test {
+  protected:
+    void SetUp() override {
+        transceiver_.start(status_);
+        ASSERT_TRUE(status_.succeeded());
+    }
+
+    std::uint16_t send() {
+        std::unique_ptr<tManagementMessage> request = nullRequest(tManagementMessagePayload::kGet);
+        return transceiver_.sendRequest(*request, status_);
+    }
+    // An answer from port `sourcePort` of a clock, to this client unless told otherwise.
+    void inject(std::uint16_t sequenceId, std::uint16_t sourcePort,
+                std::uint32_t action = kResponse, const tPortIdentity& target = clientPort()) {
+        network_.inject(
+            answerOctets(sequenceId, target, tPortIdentity(clockIdentity(1), sourcePort), action));
+    }
+    // Waits until `count` answers have been stored since the start.
+    bool storedTotal(std::uint64_t count) {
+        return eventually([&] { return transceiver_.arrivals() >= count; });
+    }
+    // The source port number of the next answer taken for `sequenceId`, 0 for none.
+    std::uint16_t take(std::uint16_t sequenceId) {
+        std::unique_ptr<tManagementMessage> answer = transceiver_.takeResponse(sequenceId, status_);
+        return answer ? answer->getHeader()->getSourcePortIdentity().getPortNumber() : 0;
+    }
+
+    tStatus status_;
+    SimulatedNetwork network_;
+    tMgmtMsgTransceiver transceiver_{&network_, clientIdentity(), kClientPort, status_};
+};
+
+TEST_F(tMgmtMsgTransceiverTest, SequenceIdsCountFromZeroAndWrapAfter65536Requests) {
+    EXPECT_EQ(send(), 0);
+    EXPECT_EQ(send(), 1);
+    for (std::uint32_t sent = 2; sent < 65536; ++sent) {
+        tStatus scratch;
+        transceiver_.retireRequest(send(), scratch);
+    }
+    EXPECT_EQ(send(), 0);
+    EXPECT_EQ(send(), 1);
+    ASSERT_TRUE(status_.succeeded());
+    // The ids are written into the datagrams too.
+    const auto sent = network_.sentDatagrams();
+    ASSERT_EQ(sent.size(), 65538U);
+    EXPECT_EQ(decodeManagement(sent[1])->getHeader()->getSequenceId(), 1);
+    EXPECT_EQ(decodeManagement(sent[65535])->getHeader()->getSequenceId(), 65535);
+    EXPECT_EQ(decodeManagement(sent[65536])->getHeader()->getSequenceId(), 0);
+}
+
+TEST_F(tMgmtMsgTransceiverTest, AnswersToUnsentOrCancelledRequestsAreDropped) {
+    const std::uint16_t cancelled = send();
+    transceiver_.cancelRequest(cancelled, status_);
+    inject(cancelled, 1);
+    inject(40, 2);  // never sent
+    const std::uint16_t awaited = send();
+    inject(awaited, 3);
+    ASSERT_TRUE(storedTotal(1));
+    EXPECT_EQ(take(cancelled), 0);
+    EXPECT_EQ(take(40), 0);
+    EXPECT_EQ(take(awaited), 3);
+    EXPECT_TRUE(status_.succeeded());
+}
+
+TEST_F(tMgmtMsgTransceiverTest, OnlyAnswersAddressedExactlyToThisPortAreKept) {
+    const std::uint16_t id = send();
+    inject(id, 1, kResponse, tPortIdentity(clientIdentity(), kClientPort + 1));
+    inject(id, 2, kResponse, nQVPTP000::allOnesPortIdentity());
+    inject(id, 3, tManagementMessagePayload::kGet);
+    inject(id, 4, tManagementMessagePayload::kSet);
+    inject(id, 5, tManagementMessagePayload::kCommand);
+    inject(id, 6, tManagementMessagePayload::kAcknowledge);
+    ASSERT_TRUE(storedTotal(1));
+    EXPECT_EQ(take(id), 6);
+    EXPECT_EQ(take(id), 0);
+}
+
+TEST_F(tMgmtMsgTransceiverTest, AnswersWithOneIdAreTakenInArrivalOrder) {
+    const std::uint16_t id = send();
+    inject(id, 3);
+    inject(id, 1);
+    inject(id, 2);
+    ASSERT_TRUE(storedTotal(3));
+    EXPECT_EQ(take(id), 3);
+    EXPECT_EQ(take(id), 1);
+    EXPECT_EQ(take(id), 2);
+    EXPECT_EQ(take(id), 0);
+}
+
+TEST_F(tMgmtMsgTransceiverTest, StoredAnswersSurviveCancelButNotRetire) {
+    const std::uint16_t kept = send();
+    const std::uint16_t retired = send();
+    inject(kept, 1);
+    inject(retired, 2);
+    ASSERT_TRUE(storedTotal(2));
+    transceiver_.cancelRequest(kept, status_);
+    transceiver_.retireRequest(retired, status_);
+    EXPECT_EQ(transceiver_.storedResponseCount(), 1U);
+    EXPECT_EQ(take(kept), 1);
+    EXPECT_EQ(take(retired), 0);
+}
+
+TEST_F(tMgmtMsgTransceiverTest, LateAnswersToRetiredRequestsDoNotAccumulate) {
+    for (int round = 0; round < 20; ++round) {
+        const std::uint16_t id = send();
+        inject(id, 1);
+        ASSERT_TRUE(storedTotal(static_cast<std::uint64_t>(round) + 1));
+        EXPECT_EQ(take(id), 1);
+        transceiver_.retireRequest(id, status_);
+        inject(id, 2);  // a second clock answers late
+    }
+    const std::uint16_t last = send();
+    inject(last, 9);  // arrives after every late answer
+    ASSERT_TRUE(storedTotal(21));
+    EXPECT_EQ(transceiver_.storedResponseCount(), 1U);
+    EXPECT_TRUE(status_.succeeded());
+}
+
+TEST_F(tMgmtMsgTransceiverTest, SendBeforeStartFailsWithNoData) {
+    tStatus status;
+    SimulatedNetwork network;
+    tMgmtMsgTransceiver idle(&network, clientIdentity(), kClientPort, status);
+    std::unique_ptr<tManagementMessage> request = nullRequest(tManagementMessagePayload::kGet);
+    EXPECT_EQ(idle.sendRequest(*request, status), 0);
+    EXPECT_EQ(status.code, kStatusNoData);
+    EXPECT_TRUE(isManagementComponent(status));
+    EXPECT_EQ(network.sentCount(), 0U);
+}
+
+TEST_F(tMgmtMsgTransceiverTest, StopEndsTheReceiveThreadAndASecondStopDoesNothing) {
+    transceiver_.stop(status_);
+    EXPECT_TRUE(status_.succeeded());
+    EXPECT_FALSE(transceiver_.isRunning());
+    EXPECT_FALSE(network_.isOpen());
+    // Nobody receives any more: what arrives stays in the network.
+    network_.inject({0x01});
+    std::this_thread::sleep_for(std::chrono::milliseconds(20));
+    EXPECT_EQ(network_.queuedCount(), 1U);
+    transceiver_.stop(status_);
+    EXPECT_TRUE(status_.succeeded());
+    std::unique_ptr<tManagementMessage> request = nullRequest(tManagementMessagePayload::kGet);
+    transceiver_.sendRequest(*request, status_);
+    EXPECT_EQ(status_.code, kStatusNoData);
+}
+
+TEST_F(tMgmtMsgTransceiverTest, RestartsAfterStop) {
+    transceiver_.stop(status_);
+    transceiver_.start(status_);
+    ASSERT_TRUE(status_.succeeded());
+    const std::uint16_t id = send();
+    inject(id, 4);
+    ASSERT_TRUE(storedTotal(1));
+    EXPECT_EQ(take(id), 4);
+}
+
+TEST_F(tMgmtMsgTransceiverTest, AFailedSendUsesUpTheIdButLeavesItUnpending) {
+    network_.failNextSend();
+    const std::uint16_t failed = send();
+    EXPECT_EQ(failed, 0);
+    EXPECT_EQ(status_.code, kStatusSocketError);
+    status_.reset();
+    inject(failed, 1);
+    const std::uint16_t next = send();
+    EXPECT_EQ(next, 1);
+    inject(next, 2);
+    ASSERT_TRUE(storedTotal(1));
+    EXPECT_EQ(take(failed), 0);
+    EXPECT_EQ(take(next), 2);
+}
+
+TEST_F(tMgmtMsgTransceiverTest, ATransportErrorDoesNotStopDelivery) {
+    const std::uint16_t id = send();
+    network_.failNextReceive();
+    network_.inject({0xDE, 0xAD});  // does not decode: dropped quietly
+    inject(id, 5);
+    ASSERT_TRUE(storedTotal(1));
+    EXPECT_EQ(take(id), 5);
+    EXPECT_EQ(transceiver_.receiveErrorCount(), 1U);
+    EXPECT_EQ(transceiver_.lastReceiveError().code, kStatusSocketError);
+}
+
+TEST_F(tMgmtMsgTransceiverTest, RunningOutOfMemoryWhileSendingIsRecordedNotThrown) {
+    std::unique_ptr<tManagementMessage> request = nullRequest(tManagementMessagePayload::kGet);
+    for (unsigned nth = 1;; ++nth) {
+        tStatus status;
+        bool triggered = false;
+        std::uint16_t id = 0;
+        {
+            ScopedAllocationFailure failure(nth);
+            id = transceiver_.sendRequest(*request, status);
+            triggered = failure.triggered();
+        }
+        if (!triggered) {
+            EXPECT_TRUE(status.succeeded());
+            break;
+        }
+        EXPECT_TRUE(status.failed()) << "allocation " << nth;
+        // The request is not awaited: an answer to it is dropped.
+        inject(id, 1);
+        const std::uint16_t sync = send();
+        inject(sync, 2);
+        ASSERT_TRUE(storedTotal(nth));
+        EXPECT_EQ(take(id), 0);
+        EXPECT_EQ(take(sync), 2);
+    }
+}
+
+TEST_F(tMgmtMsgTransceiverTest, AnAnswerThatComesBackAtOnceIsKept) {
+    // The simulated clock answers inside sendGeneralMessage: the answer may be received
+    // before the send has returned.
+    SimulatedClock clock(clockIdentity(1));
+    network_.attach(clock);
+    for (std::uint64_t round = 1; round <= 200; ++round) {
+        const std::uint16_t id = send();
+        ASSERT_TRUE(storedTotal(round)) << "answer to request " << id << " was lost";
+        EXPECT_EQ(take(id), 1);
+    }
+}
+
+}  // namespace

@@ -1,0 +1,194 @@
+// The clock proxy's own state: the cached clock description, the clock key, assign and
+// refreshClockDescription.
+#include "ptpmgmt/tPTPClockProxy.h"
+
+#include <gtest/gtest.h>
+
+#include <cstring>
+#include <string>
+
+#include "tests/ptpmgmt/ProxyFixture.h"
+
+using nQVPTP000::tPortAddress;
+using nQVPTP000::tPortIdentity;
+using nQVPTP000::tPTPText;
+using nQVPTPMGMT000::tClockKey;
+using nQVPTPMGMT000::tPTPClockProxy;
+using namespace qvtest;
+using Fault = SimulatedClock::Fault;
+
+namespace {
+
+tPTPText text(const char* value) {
+    tStatus status;
+    return tPTPText(value, status);
+}
+
+// 169.254.10.2 as an IPv4 protocol address.
+tPortAddress ipv4Address() {
+    const std::uint8_t address[] = {169, 254, 10, 2};
+    tStatus status;
+    return tPortAddress(1, 4, address, status);
+}
+
+// The clock describes port 1 fully before discovery; port 2 keeps the defaults.
+class tPTPClockProxyTest : public ProxyFixture {
+  protected:
+    void SetUp() override {
+        InMemoryManagedClock::Port& port = managed().port(1);
+        port.clockType = 0x8000 | 0x0800;  // ordinary clock and management node
+        port.physicalLayerProtocol = text("IEEE 802.3");
+        port.physicalAddress = {0x02, 0x11, 0x22, 0x33, 0x44, 0x55};
+        port.protocolAddress = ipv4Address();
+        port.manufacturerIdentity = {0x00, 0x1B, 0x19};
+        port.productDescription = text("0123456789");
+        port.revisionData = text("1.0;2.1;3.2");
+        port.profileIdentity = {0x00, 0x1B, 0x19, 0x00, 0x01, 0x00};
+        managed().userDescription = text("lab clock");
+        ProxyFixture::SetUp();
+    }
+};
+
+TEST_F(tPTPClockProxyTest, ClockTypeFlagsComeFromTheDescription) {
+    EXPECT_TRUE(proxy().isOrdinaryClock());
+    EXPECT_TRUE(proxy().isManagementNode());
+    EXPECT_FALSE(proxy().isBoundaryClock());
+    EXPECT_FALSE(proxy().isP2PTransparentClock());
+    EXPECT_FALSE(proxy().isE2ETransparentClock());
+    EXPECT_TRUE(otherPort_->isOrdinaryClock());
+    EXPECT_FALSE(otherPort_->isManagementNode());
+}
+
+TEST_F(tPTPClockProxyTest, TextsNeedRoomForTheirTerminatingZero) {
+    char product[12];
+    std::memset(product, 'x', sizeof(product));
+    proxy().getProductDescription(product, 10, status_);
+    EXPECT_EQ(status_.code, kStatusNoData);
+    EXPECT_TRUE(isManagementComponent(status_));
+    EXPECT_EQ(std::string(product, sizeof(product)), std::string(12, 'x'));
+    status_.reset();
+    proxy().getProductDescription(product, 11, status_);
+    EXPECT_TRUE(status_.succeeded());
+    EXPECT_STREQ(product, "0123456789");
+
+    char buffer[32];
+    proxy().getPhysicalLayerProtocol(buffer, sizeof(buffer), status_);
+    EXPECT_STREQ(buffer, "IEEE 802.3");
+    proxy().getRevisionData(buffer, sizeof(buffer), status_);
+    EXPECT_STREQ(buffer, "1.0;2.1;3.2");
+    proxy().getCachedUserDescription(buffer, sizeof(buffer), status_);
+    EXPECT_STREQ(buffer, "lab clock");
+    otherPort_->getProductDescription(buffer, 1, status_);  // an empty text fits in one
+    EXPECT_STREQ(buffer, "");
+    EXPECT_TRUE(status_.succeeded());
+}
+
+TEST_F(tPTPClockProxyTest, OctetFieldsNeedTheirWholeSize) {
+    EXPECT_EQ(proxy().getPhysicalAddressLength(), 6);
+    std::uint8_t octets[8];
+    std::memset(octets, 0xEE, sizeof(octets));
+    proxy().getPhysicalAddress(octets, 5, status_);
+    EXPECT_EQ(status_.code, kStatusNoData);
+    EXPECT_EQ(octets[0], 0xEE);
+    status_.reset();
+    proxy().getPhysicalAddress(octets, 6, status_);
+    EXPECT_EQ(std::vector<std::uint8_t>(octets, octets + 7),
+              (std::vector<std::uint8_t>{0x02, 0x11, 0x22, 0x33, 0x44, 0x55, 0xEE}));
+
+    std::memset(octets, 0xEE, sizeof(octets));
+    proxy().getManufacturerIdentity(octets, 2, status_);
+    EXPECT_EQ(status_.code, kStatusNoData);
+    EXPECT_EQ(octets[0], 0xEE);
+    status_.reset();
+    proxy().getManufacturerIdentity(octets, 3, status_);
+    EXPECT_EQ(std::vector<std::uint8_t>(octets, octets + 4),
+              (std::vector<std::uint8_t>{0x00, 0x1B, 0x19, 0xEE}));
+
+    proxy().getProfileIdentity(octets, 5, status_);
+    EXPECT_EQ(status_.code, kStatusNoData);
+    status_.reset();
+    proxy().getProfileIdentity(octets, 6, status_);
+    EXPECT_EQ(std::vector<std::uint8_t>(octets, octets + 6),
+              (std::vector<std::uint8_t>{0x00, 0x1B, 0x19, 0x00, 0x01, 0x00}));
+    EXPECT_TRUE(status_.succeeded());
+}
+
+TEST_F(tPTPClockProxyTest, ProtocolAddressIsACopyOfTheDescribedOne) {
+    EXPECT_EQ(proxy().getProtocolAddress(), ipv4Address());
+}
+
+TEST_F(tPTPClockProxyTest, ClockKeyIsTheIdentityThenThePortNumberHighOctetFirst) {
+    const tClockKey key = {0x00, 0x11, 0x22, 0xFF, 0xFE, 0x33, 0x44, 0x55, 0x01, 0x02};
+    tStatus status;
+    tPTPClockProxy proxy(&node_, key, nullptr, status);
+    const std::uint8_t* octets = proxy.getClockKey();
+    EXPECT_EQ(std::vector<std::uint8_t>(octets, octets + 10),
+              std::vector<std::uint8_t>(key.begin(), key.end()));
+    const std::uint8_t identity[] = {0x00, 0x11, 0x22, 0xFF, 0xFE, 0x33, 0x44, 0x55};
+    EXPECT_EQ(proxy.getPortIdentity(), tPortIdentity(nQVPTP000::tClockIdentity(identity), 0x0102));
+    // Without a description the cached readers answer their defaults.
+    EXPECT_EQ(proxy.getPhysicalAddressLength(), 0);
+    EXPECT_FALSE(proxy.isOrdinaryClock());
+}
+
+TEST_F(tPTPClockProxyTest, AssignTakesTargetAndDomainButNotTheDescription) {
+    // A proxy for another clock in domain 2, whose description differs.
+    SimulatedClock other(clockIdentity(9), 1, 2);
+    other.managed().port(1).physicalAddress = {0x0A, 0x0B};
+    network_.attach(other);
+    node_.findClocks(20, status_);
+    ASSERT_EQ(node_.clockCount(), 3);
+    const std::uint8_t* key = nullptr;
+    nQVPTPMGMT000::iPTPClockProxy* found[3] = {};
+    node_.copyClockProxies(found, 3, status_);
+    auto& source = *static_cast<tPTPClockProxy*>(found[2]);
+    ASSERT_EQ(source.getPortIdentity().getClockIdentity(), clockIdentity(9));
+
+    proxy().assign(source);
+    EXPECT_EQ(proxy().getPortIdentity(), source.getPortIdentity());
+    EXPECT_EQ(proxy().getDomainNumber(), 2);
+    EXPECT_EQ(proxy().getPhysicalAddressLength(), 6);  // its own cached description
+    key = proxy().getClockKey();
+    EXPECT_EQ(key[7], 9);
+    // Requests now go to the other clock, in its domain.
+    other.managed().defaultDataSet.priority1 = 99;
+    EXPECT_EQ(proxy().getPriority1(status_), 99);
+    EXPECT_EQ(lastRequest()->getHeader()->getDomainNumber(), 2);
+    EXPECT_TRUE(status_.succeeded());
+    node_.close(status_);  // before `other` goes
+}
+
+TEST_F(tPTPClockProxyTest, RefreshReplacesTheCachedDescriptionOnSuccessOnly) {
+    managed().port(1).productDescription = text("renamed");
+    const nQVPTP000::tClockDescriptionTLV fresh = proxy().refreshClockDescription(status_);
+    ASSERT_TRUE(status_.succeeded());
+    std::unique_ptr<nQVPTP000::tManagementMessage> request = lastRequest();
+    EXPECT_EQ(request->getPayload(status_)->getManagementId(), 0x0001);
+    EXPECT_EQ(request->getTargetPortIdentity(), proxy().getPortIdentity());
+    EXPECT_EQ(fresh.getProductDescription(), text("renamed"));
+    char product[16];
+    proxy().getProductDescription(product, sizeof(product), status_);
+    EXPECT_STREQ(product, "renamed");
+
+    managed().port(1).productDescription = text("again");
+    clock_.setFault(Fault::errorStatus);
+    const nQVPTP000::tClockDescriptionTLV failed = proxy().refreshClockDescription(status_);
+    EXPECT_EQ(status_.code, kStatusNoData);
+    EXPECT_EQ(failed.getProductDescription(), tPTPText());
+    tStatus status;
+    proxy().getProductDescription(product, sizeof(product), status);
+    EXPECT_STREQ(product, "renamed");
+}
+
+TEST_F(tPTPClockProxyTest, ARefreshedDescriptionSurvivesALaterDiscovery) {
+    managed().port(1).productDescription = text("refreshed");
+    proxy().refreshClockDescription(status_);
+    managed().port(1).productDescription = text("rediscovered");
+    node_.findClocks(20, status_);
+    char product[16];
+    proxy().getProductDescription(product, sizeof(product), status_);
+    EXPECT_STREQ(product, "rediscovered");
+    EXPECT_TRUE(status_.succeeded());
+}
+
+}  // namespace

@@ -1,0 +1,179 @@
+#include "tests/support/ptpmgmt/SimulatedClock.h"
+
+#include "ptp/TLVs/tManagementErrorStatusTLV.h"
+#include "ptp/TLVs/tNullManagementTLV.h"
+#include "ptp/TLVs/tPriority1TLV.h"
+#include "ptp/tMessageHeader.h"
+#include "ptp/tPTPMessageFactory.h"
+#include "ptp/tProtocolDataUnit.h"
+
+using nQVPTP000::tManagementMessage;
+using nQVPTP000::tManagementMessagePayload;
+using nQVPTP000::tMessageHeader;
+using nQVPTP000::tPortIdentity;
+using nQVPTP000::tProtocolDataUnit;
+
+namespace qvtest {
+
+namespace {
+
+// Octets kept of an answer sent as garbage: the header and part of the body.
+constexpr std::size_t kGarbageLength = 40;
+
+std::uint32_t answerAction(std::uint32_t requestAction, bool swapped) {
+    const bool command = requestAction == tManagementMessagePayload::kCommand;
+    return command != swapped ? tManagementMessagePayload::kAcknowledge
+                              : tManagementMessagePayload::kResponse;
+}
+
+}  // namespace
+
+std::vector<std::uint8_t> encodeMessage(const nQVPTP000::tPTPMessage& message) {
+    tStatus status;
+    tProtocolDataUnit unit(status);
+    message.serialize(unit, status);
+    if (status.failed()) {
+        return {};
+    }
+    return {unit.getBuffer(), unit.getBuffer() + unit.getLength()};
+}
+
+std::unique_ptr<tManagementMessage> decodeManagement(const std::vector<std::uint8_t>& octets) {
+    tStatus status;
+    tProtocolDataUnit unit(status);
+    unit.writeOctets(octets.data(), octets.size(), status);
+    std::unique_ptr<nQVPTP000::tPTPMessage> message =
+        nQVPTP000::tPTPMessageFactory::createMessage(unit, status);
+    if (status.failed() || !message || message->getHeader() == nullptr ||
+        message->getHeader()->getMessageType() != tMessageHeader::kManagement) {
+        return nullptr;
+    }
+    return std::unique_ptr<tManagementMessage>(static_cast<tManagementMessage*>(message.release()));
+}
+
+SimulatedClock::SimulatedClock(const nQVPTP000::tClockIdentity& identity, std::uint16_t numberPorts,
+                               std::uint8_t domainNumber)
+    : identity_(identity), numberPorts_(numberPorts), managed_(numberPorts) {
+    managed_.defaultDataSet.clockIdentity = identity;
+    managed_.defaultDataSet.domainNumber = domainNumber;
+    managed_.parentDataSet.parentPortIdentity = tPortIdentity(identity, 0);
+    managed_.parentDataSet.grandmasterIdentity = identity;
+    for (std::uint16_t number = 1; number <= numberPorts; ++number) {
+        managed_.port(number).portIdentity = tPortIdentity(identity, number);
+    }
+}
+
+void SimulatedClock::setFault(Fault fault) {
+    std::lock_guard<std::mutex> guard(lock_);
+    fault_ = fault;
+}
+
+void SimulatedClock::setDelay(std::chrono::milliseconds delay) {
+    std::lock_guard<std::mutex> guard(lock_);
+    delay_ = delay;
+}
+
+std::uint64_t SimulatedClock::requestsSeen() const {
+    std::lock_guard<std::mutex> guard(lock_);
+    return requestsSeen_;
+}
+
+std::vector<SimulatedAnswer> SimulatedClock::answer(const std::uint8_t* octets,
+                                                    std::size_t length) {
+    std::unique_ptr<tManagementMessage> request =
+        decodeManagement(std::vector<std::uint8_t>(octets, octets + length));
+    std::vector<SimulatedAnswer> answers;
+    std::lock_guard<std::mutex> guard(lock_);
+    if (!request || !addressedToUs(*request)) {
+        return answers;
+    }
+    ++requestsSeen_;
+    if (fault_ == Fault::silent) {
+        return answers;
+    }
+    const std::uint16_t target = request->getTargetPortIdentity().getPortNumber();
+    if (target != tPortIdentity::kAllPorts) {
+        answerAsPort(*request, target, answers);
+        return answers;
+    }
+    for (std::uint16_t port = 1; port <= numberPorts_; ++port) {
+        answerAsPort(*request, port, answers);
+    }
+    return answers;
+}
+
+// A GET, SET or COMMAND in the clock's domain, to the clock (or all clocks) and to one of
+// its ports (or all ports).
+bool SimulatedClock::addressedToUs(const tManagementMessage& request) const {
+    const std::uint32_t action = request.getActionField();
+    if (action != tManagementMessagePayload::kGet && action != tManagementMessagePayload::kSet &&
+        action != tManagementMessagePayload::kCommand) {
+        return false;
+    }
+    if (request.getHeader()->getDomainNumber() != managed_.defaultDataSet.domainNumber) {
+        return false;
+    }
+    const tPortIdentity target = request.getTargetPortIdentity();
+    const bool clockMatches = target.getClockIdentity() == identity_ ||
+                              target.getClockIdentity() == nQVPTP000::allOnesClockIdentity();
+    const std::uint16_t port = target.getPortNumber();
+    const bool portMatches =
+        port == tPortIdentity::kAllPorts || (port >= 1 && port <= numberPorts_);
+    return clockMatches && portMatches;
+}
+
+std::unique_ptr<tManagementMessagePayload> SimulatedClock::payloadFor(tManagementMessage& request,
+                                                                      std::uint16_t port,
+                                                                      tStatus& status) {
+    tManagementMessagePayload* asked = request.getPayload(status);
+    if (asked == nullptr) {
+        return nullptr;
+    }
+    const std::uint16_t managementId = asked->getManagementId();
+    switch (fault_) {
+        case Fault::errorStatus:
+            return std::make_unique<nQVPTP000::tManagementErrorStatusTLV>(
+                managementId, nQVPTP000::tManagementErrorStatusTLV::kGeneralError,
+                "simulated failure");
+        case Fault::wrongManagementId:
+            if (managementId == 0x0000) {
+                return std::make_unique<nQVPTP000::tPriority1TLV>();
+            }
+            return std::make_unique<nQVPTP000::tNullManagementTLV>();
+        default:
+            return asked->respond(request.getActionField(), managed_, port, status);
+    }
+}
+
+void SimulatedClock::answerAsPort(tManagementMessage& request, std::uint16_t port,
+                                  std::vector<SimulatedAnswer>& answers) {
+    tStatus status;
+    std::unique_ptr<tManagementMessagePayload> payload = payloadFor(request, port, status);
+    tManagementMessage reply(status);
+    reply.setActionField(answerAction(request.getActionField(), fault_ == Fault::wrongAction),
+                         status);
+    tPortIdentity target = request.getHeader()->getSourcePortIdentity();
+    if (fault_ == Fault::wrongTargetPort) {
+        target = tPortIdentity(target.getClockIdentity(),
+                               static_cast<std::uint16_t>(target.getPortNumber() + 1));
+    }
+    reply.setTargetPortIdentity(target, status);
+    reply.setPayload(std::move(payload), status);
+    tMessageHeader* header = reply.getHeader();
+    header->setDomainNumber(request.getHeader()->getDomainNumber(), status);
+    header->setSequenceId(request.getHeader()->getSequenceId(), status);
+    header->setSourcePortIdentity(tPortIdentity(identity_, port), status);
+    if (status.failed()) {
+        return;
+    }
+    SimulatedAnswer answer{encodeMessage(reply), delay_};
+    if (fault_ == Fault::garbage) {
+        answer.octets.resize(std::min(answer.octets.size(), kGarbageLength));
+    }
+    if (fault_ == Fault::twice) {
+        answers.push_back(answer);
+    }
+    answers.push_back(std::move(answer));
+}
+
+}  // namespace qvtest
