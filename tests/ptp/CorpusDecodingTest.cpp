@@ -71,15 +71,7 @@ std::string hexNumber(unsigned value, int digits) {
 
 class CorpusDecodingTest : public ::testing::TestWithParam<std::filesystem::path> {
   protected:
-    void SetUp() override {
-        if (!TsharkDecode::available()) {
-            const char* ci = std::getenv("CI");
-            if (ci != nullptr && std::string(ci) == "true") {
-                FAIL() << "tshark is not installed, and CI must run this test";
-            }
-            GTEST_SKIP() << "tshark is not installed";
-        }
-    }
+    void SetUp() override { QV_REQUIRE_TSHARK(); }
 
     void expectHeader(const tMessageHeader& header, const TsharkDecode& tshark) {
         EXPECT_EQ(hexNumber(header.getMessageType(), 2), tshark.show("ptp.v2.messagetype"));

@@ -24,15 +24,7 @@ std::vector<std::uint8_t> octetsOf(const tPTPMessage& message) {
 
 class MessageTsharkAgreementTest : public ::testing::Test {
   protected:
-    void SetUp() override {
-        if (!qvtest::TsharkDecode::available()) {
-            const char* ci = std::getenv("CI");
-            if (ci != nullptr && std::string(ci) == "true") {
-                FAIL() << "tshark is not installed, and CI must run this test";
-            }
-            GTEST_SKIP() << "tshark is not installed";
-        }
-    }
+    void SetUp() override { QV_REQUIRE_TSHARK(); }
 
     // A request as the management client builds it: action, target, payload, then domain
     // and source port identity on the header, and the sequence id.

@@ -28,15 +28,7 @@ std::vector<std::uint8_t> managementAround(const tTLV& tlv) {
 
 class TsharkAgreementTest : public ::testing::Test {
   protected:
-    void SetUp() override {
-        if (!qvtest::TsharkDecode::available()) {
-            const char* ci = std::getenv("CI");
-            if (ci != nullptr && std::string(ci) == "true") {
-                FAIL() << "tshark is not installed, and CI must run this test";
-            }
-            GTEST_SKIP() << "tshark is not installed";
-        }
-    }
+    void SetUp() override { QV_REQUIRE_TSHARK(); }
 };
 
 TEST_F(TsharkAgreementTest, ErrorStatusTlvWithDisplayText) {

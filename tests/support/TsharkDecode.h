@@ -5,6 +5,8 @@
 #include <string>
 #include <vector>
 
+#include "tests/support/NetworkTestGuard.h"
+
 namespace qvtest {
 
 // An independent decoding of one PTP datagram: the octets are wrapped in UDP/IPv4 with
@@ -36,5 +38,17 @@ class TsharkDecode {
 };
 
 }  // namespace qvtest
+
+// First statement of a test that decodes with tshark: skips it when tshark is missing, or
+// fails it under CI=true, where it must run.
+#define QV_REQUIRE_TSHARK()                                                     \
+    do {                                                                        \
+        if (!qvtest::TsharkDecode::available()) {                               \
+            if (qvtest::runningUnderCi()) {                                     \
+                FAIL() << "tshark is not installed, and CI must run this test"; \
+            }                                                                   \
+            GTEST_SKIP() << "tshark is not installed";                          \
+        }                                                                       \
+    } while (false)
 
 #endif

@@ -168,15 +168,7 @@ const std::vector<Case>& cases() {
 
 class TlvTsharkAgreementTest : public ::testing::TestWithParam<Case> {
   protected:
-    void SetUp() override {
-        if (!qvtest::TsharkDecode::available()) {
-            const char* ci = std::getenv("CI");
-            if (ci != nullptr && std::string(ci) == "true") {
-                FAIL() << "tshark is not installed, and CI must run this test";
-            }
-            GTEST_SKIP() << "tshark is not installed";
-        }
-    }
+    void SetUp() override { QV_REQUIRE_TSHARK(); }
 };
 
 TEST_P(TlvTsharkAgreementTest, RequestAndResponseDecodeToOurValues) {
