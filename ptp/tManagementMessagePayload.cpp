@@ -38,6 +38,16 @@ tManagementMessagePayload* tManagementMessagePayload::respondToCommand(iManagedC
 
 std::unique_ptr<tManagementMessagePayload> tManagementMessagePayload::respond(
     std::uint32_t actionField, iManagedClock& clock, std::uint16_t port, tStatus& status) {
+    try {
+        return dispatch(actionField, clock, port, status);
+    } catch (const std::bad_alloc&) {
+        QV_STATUS_SET(status, kStatusNoMemory, kComponentCodec);
+        return nullptr;
+    }
+}
+
+std::unique_ptr<tManagementMessagePayload> tManagementMessagePayload::dispatch(
+    std::uint32_t actionField, iManagedClock& clock, std::uint16_t port, tStatus& status) {
     tManagementMessagePayload* answer = nullptr;
     switch (actionField) {
         case kGet:

@@ -39,12 +39,15 @@ class tManagementMessagePayload : public tTLV {
                                                         tStatus& status);
 
     // The answer to a request with `actionField` (GET, SET or COMMAND), owned by the caller;
-    // null when the status holds an error.
+    // null when the status holds an error or memory runs out (-52000).
     std::unique_ptr<tManagementMessagePayload> respond(std::uint32_t actionField,
                                                        iManagedClock& clock, std::uint16_t port,
                                                        tStatus& status);
 
   protected:
+    std::unique_ptr<tManagementMessagePayload> dispatch(std::uint32_t actionField,
+                                                        iManagedClock& clock, std::uint16_t port,
+                                                        tStatus& status);
     tManagementMessagePayload(const tManagementMessagePayload&) = default;
     tManagementMessagePayload& operator=(const tManagementMessagePayload&) = default;
 

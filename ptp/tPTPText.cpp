@@ -34,11 +34,10 @@ tPTPText::tPTPText(const tPTPText& other) {
 
 tPTPText& tPTPText::operator=(const tPTPText& other) {
     if (this != &other) {
-        tStatus scratch;
-        setText(other.textField_.get(), other.lengthField_, scratch);
-        if (scratch.failed()) {
-            lengthField_ = 0;
-            textField_.reset();
+        tStatus status;
+        setText(other.textField_.get(), other.lengthField_, status);
+        if (status.failed()) {
+            throw std::bad_alloc();  // this text is unchanged
         }
     }
     return *this;

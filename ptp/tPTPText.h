@@ -18,7 +18,8 @@ class tPTPText : public iPTPSerializable {
     tPTPText() = default;
     // A text of 256 octets or more records -52005 and leaves this one empty.
     tPTPText(const char* text, tStatus& status);
-    // Deep copies; a copy that cannot get memory for the octets is left empty.
+    // Deep copies. Like any value, a copy that cannot get memory throws std::bad_alloc
+    // (the target keeps its text): a quietly emptied copy would pass for the real text.
     tPTPText(const tPTPText& other);
     tPTPText& operator=(const tPTPText& other);
     tPTPText(tPTPText&&) noexcept = default;

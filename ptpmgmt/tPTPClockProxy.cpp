@@ -61,13 +61,36 @@ const std::uint8_t* tPTPClockProxy::getClockKey() {
 
 // ---- exchanges ----
 
-std::unique_ptr<tManagementMessage> tPTPClockProxy::exchange(
-    std::unique_ptr<tManagementTLV> payload, std::uint32_t actionField, tStatus& status) {
+// One exchange whose payload `make` builds (and fills, for a SET). Memory running out on
+// the way is recorded as -52000: no exception leaves the protocol layer.
+template <typename Make>
+std::unique_ptr<tManagementMessage> tPTPClockProxy::exchange(Make&& make, std::uint32_t actionField,
+                                                             tStatus& status) {
     if (status.failed()) {
         return nullptr;
     }
-    return node_->sendAndAwait(target_, std::move(payload), actionField, timeout_,
-                               domainNumber_.load(), status);
+    try {
+        return node_->sendAndAwait(target_, make(), actionField, timeout_, domainNumber_.load(),
+                                   status);
+    } catch (const std::bad_alloc&) {
+        QV_STATUS_SET(status, kStatusNoMemory, kComponentMgmt);
+        return nullptr;
+    }
+}
+
+// A copy of an answer's record, or the defaults of its class when there is none or memory
+// runs out while copying.
+template <typename TLV>
+TLV tPTPClockProxy::copyOf(const TLV* tlv, tStatus& status) {
+    if (tlv == nullptr) {
+        return TLV();
+    }
+    try {
+        return TLV(*tlv);
+    } catch (const std::bad_alloc&) {
+        QV_STATUS_SET(status, kStatusNoMemory, kComponentMgmt);
+        return TLV();
+    }
 }
 
 template <typename TLV>
@@ -85,78 +108,90 @@ const TLV* tPTPClockProxy::payloadOf(tManagementMessage* answer, tStatus& status
 template <typename TLV, typename Value>
 Value tPTPClockProxy::getValueOf(Value failure, tStatus& status) {
     std::unique_ptr<tManagementMessage> answer =
-        exchange(std::make_unique<TLV>(), tAction::kGet, status);
+        exchange([] { return std::make_unique<TLV>(); }, tAction::kGet, status);
     const TLV* tlv = payloadOf<TLV>(answer.get(), status);
     return tlv != nullptr ? static_cast<Value>(tlv->getValue()) : failure;
 }
 
 template <typename TLV, typename Value>
 void tPTPClockProxy::setValueOf(Value value, tStatus& status) {
-    auto tlv = std::make_unique<TLV>();
-    tlv->setValue(value, status);
-    exchange(std::move(tlv), tAction::kSet, status);
+    exchange(
+        [&] {
+            auto tlv = std::make_unique<TLV>();
+            tlv->setValue(value, status);
+            return tlv;
+        },
+        tAction::kSet, status);
 }
 
 template <typename TLV>
 TLV tPTPClockProxy::getRecord(tStatus& status) {
     std::unique_ptr<tManagementMessage> answer =
-        exchange(std::make_unique<TLV>(), tAction::kGet, status);
-    const TLV* tlv = payloadOf<TLV>(answer.get(), status);
-    return tlv != nullptr ? TLV(*tlv) : TLV();
+        exchange([] { return std::make_unique<TLV>(); }, tAction::kGet, status);
+    return copyOf(payloadOf<TLV>(answer.get(), status), status);
 }
 
-template <typename TLV>
-void tPTPClockProxy::run(std::unique_ptr<TLV> payload, std::uint32_t actionField, tStatus& status) {
-    exchange(std::move(payload), actionField, status);
+template <typename TLV, typename... Arguments>
+void tPTPClockProxy::run(std::uint32_t actionField, tStatus& status,
+                         const Arguments&... arguments) {
+    exchange([&] { return std::make_unique<TLV>(arguments...); }, actionField, status);
 }
 
 void tPTPClockProxy::getNullManagement(tStatus& status) {
-    run(std::make_unique<tNullManagementTLV>(), tAction::kGet, status);
+    run<tNullManagementTLV>(tAction::kGet, status);
 }
 void tPTPClockProxy::setNullManagement(tStatus& status) {
-    run(std::make_unique<tNullManagementTLV>(), tAction::kSet, status);
+    run<tNullManagementTLV>(tAction::kSet, status);
 }
 void tPTPClockProxy::commandNullManagement(tStatus& status) {
-    run(std::make_unique<tNullManagementTLV>(), tAction::kCommand, status);
+    run<tNullManagementTLV>(tAction::kCommand, status);
 }
 void tPTPClockProxy::saveInNonVolatileStorage(tStatus& status) {
-    run(std::make_unique<tSaveInNonVolatileStorageTLV>(), tAction::kCommand, status);
+    run<tSaveInNonVolatileStorageTLV>(tAction::kCommand, status);
 }
 void tPTPClockProxy::resetNonVolatileStorage(tStatus& status) {
-    run(std::make_unique<tResetNonVolatileStorageTLV>(), tAction::kCommand, status);
+    run<tResetNonVolatileStorageTLV>(tAction::kCommand, status);
 }
 void tPTPClockProxy::initialize(std::uint16_t initializationKey, tStatus& status) {
-    run(std::make_unique<tInitializeTLV>(initializationKey), tAction::kCommand, status);
+    run<tInitializeTLV>(tAction::kCommand, status, initializationKey);
 }
 void tPTPClockProxy::enablePort(tStatus& status) {
-    run(std::make_unique<tEnablePortTLV>(), tAction::kCommand, status);
+    run<tEnablePortTLV>(tAction::kCommand, status);
 }
 void tPTPClockProxy::disablePort(tStatus& status) {
-    run(std::make_unique<tDisablePortTLV>(), tAction::kCommand, status);
+    run<tDisablePortTLV>(tAction::kCommand, status);
 }
 
 void tPTPClockProxy::getUserDescription(char* buffer, std::uint16_t size, tStatus& status) {
     std::unique_ptr<tManagementMessage> answer =
-        exchange(std::make_unique<tUserDescriptionTLV>(), tAction::kGet, status);
+        exchange([] { return std::make_unique<tUserDescriptionTLV>(); }, tAction::kGet, status);
     const tUserDescriptionTLV* tlv = payloadOf<tUserDescriptionTLV>(answer.get(), status);
     if (tlv == nullptr) {
         return;
     }
-    const tPTPText text = tlv->getUserDescription();
-    const std::size_t count = std::min<std::size_t>(text.getLengthField(), size);
-    if (count != 0) {
-        std::memcpy(buffer, text.getTextField(), count);
-    }
-    if (count < size) {
-        buffer[count] = '\0';
+    try {
+        const tPTPText text = tlv->getUserDescription();
+        const std::size_t count = std::min<std::size_t>(text.getLengthField(), size);
+        if (count != 0) {
+            std::memcpy(buffer, text.getTextField(), count);
+        }
+        if (count < size) {
+            buffer[count] = '\0';
+        }
+    } catch (const std::bad_alloc&) {
+        QV_STATUS_SET(status, kStatusNoMemory, kComponentMgmt);
     }
 }
 
 void tPTPClockProxy::setUserDescription(const char* text, tStatus& status) {
     const tPTPText description(text, status);
-    auto tlv = std::make_unique<tUserDescriptionTLV>();
-    tlv->setUserDescription(description, status);
-    exchange(std::move(tlv), tAction::kSet, status);
+    exchange(
+        [&] {
+            auto tlv = std::make_unique<tUserDescriptionTLV>();
+            tlv->setUserDescription(description, status);
+            return tlv;
+        },
+        tAction::kSet, status);
 }
 
 tTimestamp tPTPClockProxy::getTime(tStatus& status) {
@@ -164,9 +199,13 @@ tTimestamp tPTPClockProxy::getTime(tStatus& status) {
 }
 
 void tPTPClockProxy::setTime(const tTimestamp& time, tStatus& status) {
-    auto tlv = std::make_unique<tTimeTLV>();
-    tlv->setCurrentTime(time, status);
-    exchange(std::move(tlv), tAction::kSet, status);
+    exchange(
+        [&] {
+            auto tlv = std::make_unique<tTimeTLV>();
+            tlv->setCurrentTime(time, status);
+            return tlv;
+        },
+        tAction::kSet, status);
 }
 
 std::uint8_t tPTPClockProxy::getPriority1(tStatus& status) {
@@ -258,14 +297,14 @@ tUTCPropertiesTLV tPTPClockProxy::getUTCProperties(tStatus& status) {
     return getRecord<tUTCPropertiesTLV>(status);
 }
 void tPTPClockProxy::setUTCProperties(const tUTCPropertiesTLV& properties, tStatus& status) {
-    run(std::make_unique<tUTCPropertiesTLV>(properties), tAction::kSet, status);
+    run<tUTCPropertiesTLV>(tAction::kSet, status, properties);
 }
 tTraceabilityPropertiesTLV tPTPClockProxy::getTraceabilityProperties(tStatus& status) {
     return getRecord<tTraceabilityPropertiesTLV>(status);
 }
 void tPTPClockProxy::setTraceabilityProperties(const tTraceabilityPropertiesTLV& properties,
                                                tStatus& status) {
-    run(std::make_unique<tTraceabilityPropertiesTLV>(properties), tAction::kSet, status);
+    run<tTraceabilityPropertiesTLV>(tAction::kSet, status, properties);
 }
 
 // ---- the cached clock description ----
@@ -329,20 +368,26 @@ void tPTPClockProxy::copyText(tPTPText (tClockDescriptionTLV::*getter)() const, 
     if (status.failed()) {
         return;
     }
-    const bool described = readDescription(
-        [&](const tClockDescriptionTLV& d) {
-            const tPTPText text = (d.*getter)();
-            if (text.getLengthField() + 1U > size) {
-                QV_STATUS_SET(status, kStatusNoData, kComponentMgmt);
+    bool described = false;
+    try {
+        described = readDescription(
+            [&](const tClockDescriptionTLV& d) {
+                const tPTPText text = (d.*getter)();
+                if (text.getLengthField() + 1U > size) {
+                    QV_STATUS_SET(status, kStatusNoData, kComponentMgmt);
+                    return true;
+                }
+                if (text.getLengthField() != 0) {
+                    std::memcpy(buffer, text.getTextField(), text.getLengthField());
+                }
+                buffer[text.getLengthField()] = '\0';
                 return true;
-            }
-            if (text.getLengthField() != 0) {
-                std::memcpy(buffer, text.getTextField(), text.getLengthField());
-            }
-            buffer[text.getLengthField()] = '\0';
-            return true;
-        },
-        false);
+            },
+            false);
+    } catch (const std::bad_alloc&) {
+        QV_STATUS_SET(status, kStatusNoMemory, kComponentMgmt);
+        return;
+    }
     if (!described) {
         QV_STATUS_SET(status, kStatusNoData, kComponentMgmt);
     }
@@ -404,13 +449,17 @@ void tPTPClockProxy::getProfileIdentity(std::uint8_t* buffer, std::uint16_t size
 
 tClockDescriptionTLV tPTPClockProxy::refreshClockDescription(tStatus& status) {
     std::unique_ptr<tManagementMessage> answer =
-        exchange(std::make_unique<tClockDescriptionTLV>(), tAction::kGet, status);
-    const tClockDescriptionTLV* tlv = payloadOf<tClockDescriptionTLV>(answer.get(), status);
-    if (tlv == nullptr) {
-        return tClockDescriptionTLV();
+        exchange([] { return std::make_unique<tClockDescriptionTLV>(); }, tAction::kGet, status);
+    tClockDescriptionTLV copy =
+        copyOf(payloadOf<tClockDescriptionTLV>(answer.get(), status), status);
+    if (status.succeeded()) {
+        try {
+            setCachedDescription(tDescription(std::move(answer)));
+        } catch (const std::bad_alloc&) {
+            QV_STATUS_SET(status, kStatusNoMemory, kComponentMgmt);
+            return tClockDescriptionTLV();
+        }
     }
-    tClockDescriptionTLV copy(*tlv);
-    setCachedDescription(tDescription(std::move(answer)));
     return copy;
 }
 

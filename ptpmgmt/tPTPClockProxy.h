@@ -117,9 +117,11 @@ class tPTPClockProxy final : public iPTPClockProxy {
     void setExchangeTimeout(std::uint16_t timeoutMs) { timeout_ = timeoutMs; }
 
   private:
-    std::unique_ptr<nQVPTP000::tManagementMessage> exchange(
-        std::unique_ptr<nQVPTP000::tManagementTLV> payload, std::uint32_t actionField,
-        tStatus& status);
+    template <typename Make>
+    std::unique_ptr<nQVPTP000::tManagementMessage> exchange(Make&& make, std::uint32_t actionField,
+                                                            tStatus& status);
+    template <typename TLV>
+    static TLV copyOf(const TLV* tlv, tStatus& status);
     template <typename TLV>
     static const TLV* payloadOf(nQVPTP000::tManagementMessage* answer, tStatus& status);
     template <typename TLV, typename Value>
@@ -128,8 +130,8 @@ class tPTPClockProxy final : public iPTPClockProxy {
     void setValueOf(Value value, tStatus& status);
     template <typename TLV>
     TLV getRecord(tStatus& status);
-    template <typename TLV>
-    void run(std::unique_ptr<TLV> payload, std::uint32_t actionField, tStatus& status);
+    template <typename TLV, typename... Arguments>
+    void run(std::uint32_t actionField, tStatus& status, const Arguments&... arguments);
 
     // The cached description's payload, or null when the answer was not a description.
     tDescription cachedDescription() const;

@@ -58,11 +58,22 @@ void tPTPMgmtNode::findClocksInDefaultDomain(std::uint16_t timeoutMs, tStatus& s
     discover(1, timeoutMs, status);
 }
 
+// Memory for the request runs out before anything is sent, if at all: collecting records
+// its own failures, so a discovery never leaves requests awaited behind it.
+void tPTPMgmtNode::discover(std::uint8_t domains, std::uint16_t timeoutMs, tStatus& status) {
+    try {
+        sendAndCollect(domains, timeoutMs, status);
+    } catch (const std::bad_alloc&) {
+        QV_STATUS_SET(status, kStatusNoMemory, kComponentMgmt);
+    }
+}
+
 // Sends the request in domains 0 .. domains - 1 with consecutive sequence ids, lets the
 // receive thread collect answers for `timeoutMs`, then makes a proxy of every new port.
-void tPTPMgmtNode::discover(std::uint8_t domains, std::uint16_t timeoutMs, tStatus& status) {
+void tPTPMgmtNode::sendAndCollect(std::uint8_t domains, std::uint16_t timeoutMs, tStatus& status) {
     std::unique_ptr<tManagementMessage> request = discoveryRequest(status);
     std::vector<std::uint16_t> sent;
+    sent.reserve(domains);
     tMutex::tGuard clockList(clockListLock_, status);
     {
         tMutex::tGuard requests(requestLock_, status);

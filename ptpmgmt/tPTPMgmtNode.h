@@ -62,6 +62,7 @@ class tPTPMgmtNode final : public iPTPMgmtNode {
 
     std::unique_ptr<nQVPTP000::tManagementMessage> discoveryRequest(tStatus& status) const;
     void discover(std::uint8_t domains, std::uint16_t timeoutMs, tStatus& status);
+    void sendAndCollect(std::uint8_t domains, std::uint16_t timeoutMs, tStatus& status);
     void collect(std::uint16_t sequenceId, tStatus& status);
     std::unique_ptr<nQVPTP000::tManagementMessage> await(
         std::uint16_t sequenceId, const nQVPTP000::tManagementMessage& request,

@@ -29,17 +29,13 @@ tClockDescriptionTLV::tClockDescriptionTLV(const tClockDescriptionTLV& other)
       boundaryClock_(other.boundaryClock_),
       physicalLayerProtocol_(other.physicalLayerProtocol_),
       physicalAddressLength_(other.physicalAddressLength_),
+      physicalAddress_(other.physicalAddress_),
       protocolAddress_(other.protocolAddress_),
       manufacturerIdentity_(other.manufacturerIdentity_),
       productDescription_(other.productDescription_),
       revisionData_(other.revisionData_),
       userDescription_(other.userDescription_),
       profileIdentity_(other.profileIdentity_) {
-    try {
-        physicalAddress_ = other.physicalAddress_;
-    } catch (const std::bad_alloc&) {
-        physicalAddressLength_ = 0;
-    }
     tStatus scratch;
     updatePad(scratch);
 }

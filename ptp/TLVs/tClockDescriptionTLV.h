@@ -19,7 +19,9 @@ class tClockDescriptionTLV final : public tDataFieldTLV<tClockDescriptionTLV> {
   public:
     tClockDescriptionTLV();
     // A copy whose address array cannot be allocated keeps no address (length 0).
+    // A copy that cannot get memory throws std::bad_alloc; moving never allocates.
     tClockDescriptionTLV(const tClockDescriptionTLV& other);
+    tClockDescriptionTLV(tClockDescriptionTLV&& other) noexcept = default;
     tClockDescriptionTLV& operator=(const tClockDescriptionTLV&) = delete;
 
     // The fields before the pad octet.

@@ -38,7 +38,8 @@ void tUserDescriptionTLV::setUserDescription(const tPTPText& userDescription, tS
     if (status.failed()) {
         return;
     }
-    userDescription_ = userDescription;
+    userDescription_.setText(userDescription.getTextField(), userDescription.getLengthField(),
+                             status);
     updateLength(2);
 }
 

@@ -8,6 +8,7 @@
 #include <string>
 
 #include "tests/ptpmgmt/ProxyFixture.h"
+#include "tests/support/FailingAllocation.h"
 
 using nQVPTP000::tPortAddress;
 using nQVPTP000::tPortIdentity;
@@ -15,6 +16,7 @@ using nQVPTP000::tPTPText;
 using nQVPTPMGMT000::tClockKey;
 using nQVPTPMGMT000::tPTPClockProxy;
 using namespace qvtest;
+using qvtest::ScopedAllocationFailure;
 using Fault = SimulatedClock::Fault;
 
 namespace {
@@ -192,3 +194,40 @@ TEST_F(tPTPClockProxyTest, ARefreshedDescriptionSurvivesALaterDiscovery) {
 }
 
 }  // namespace
+
+namespace {
+
+// Makes each allocation of `operation` on the calling thread fail in turn, until one run
+// needs no more than it was given: memory running out must end as a failed status, never
+// as an exception out of the management client.
+template <typename Operation>
+void failEachAllocationOf(const char* name, Operation&& operation) {
+    for (unsigned nth = 1; nth < 1000; ++nth) {
+        tStatus status;
+        bool triggered = false;
+        {
+            ScopedAllocationFailure failure(nth);
+            EXPECT_NO_THROW(operation(status)) << "allocation " << nth;
+            triggered = failure.triggered();
+        }
+        if (!triggered) {
+            EXPECT_TRUE(status.succeeded()) << status.code;
+            return;
+        }
+        EXPECT_TRUE(status.failed()) << name << ": allocation " << nth;
+    }
+    ADD_FAILURE() << "the operation kept allocating";
+}
+
+}  // namespace
+
+TEST_F(tPTPClockProxyTest, RunningOutOfMemoryInExchangesIsRecordedNotThrown) {
+    proxy().setExchangeTimeout(20);
+    failEachAllocationOf("getDefaultDataSet",
+                         [&](tStatus& status) { proxy().getDefaultDataSet(status); });
+    failEachAllocationOf("setUserDescription",
+                         [&](tStatus& status) { proxy().setUserDescription("rack 7", status); });
+    failEachAllocationOf("refreshClockDescription",
+                         [&](tStatus& status) { proxy().refreshClockDescription(status); });
+    failEachAllocationOf("findClocks", [&](tStatus& status) { node_.findClocks(20, status); });
+}

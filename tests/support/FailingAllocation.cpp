@@ -36,6 +36,14 @@ bool ScopedAllocationFailure::triggered() const {
     return failureTriggered;
 }
 
+AllocationFailurePause::AllocationFailurePause() : saved_(allocationsBeforeFailure) {
+    allocationsBeforeFailure = 0;
+}
+
+AllocationFailurePause::~AllocationFailurePause() {
+    allocationsBeforeFailure = saved_;
+}
+
 }  // namespace qvtest
 
 void* operator new(std::size_t size) {

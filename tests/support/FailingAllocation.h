@@ -17,6 +17,20 @@ class ScopedAllocationFailure {
     bool triggered() const;
 };
 
+// While alive, a planned failure waits: allocations on the calling thread neither fail nor
+// count. For test doubles that stand for another machine, whose memory is not the one
+// under test.
+class AllocationFailurePause {
+  public:
+    AllocationFailurePause();
+    ~AllocationFailurePause();
+    AllocationFailurePause(const AllocationFailurePause&) = delete;
+    AllocationFailurePause& operator=(const AllocationFailurePause&) = delete;
+
+  private:
+    unsigned saved_;
+};
+
 }  // namespace qvtest
 
 #endif

@@ -72,6 +72,20 @@ TEST(ManagementIdTableTest, CloneKeepsAReceivedClockDescription) {
     const auto copy = tlv.clone(status);
     ASSERT_NE(copy, nullptr);
     EXPECT_EQ(encode(*copy), encode(tlv));
+
+    // A copy that cannot get memory for a text or the address is no copy at all: never one
+    // that quietly lost them.
+    for (unsigned nth = 1;; ++nth) {
+        tStatus cloneStatus;
+        qvtest::ScopedAllocationFailure failure(nth);
+        const auto partial = tlv.clone(cloneStatus);
+        if (!failure.triggered()) {
+            ASSERT_NE(partial, nullptr);
+            break;
+        }
+        EXPECT_EQ(partial, nullptr) << "allocation " << nth;
+        EXPECT_EQ(cloneStatus.code, kStatusNoMemory) << "allocation " << nth;
+    }
 }
 
 // A status that already holds an error turns decoding into a no-op: nothing changes.

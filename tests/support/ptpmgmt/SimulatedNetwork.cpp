@@ -1,5 +1,7 @@
 #include "tests/support/ptpmgmt/SimulatedNetwork.h"
 
+#include "tests/support/FailingAllocation.h"
+
 #include <new>
 
 using nQVPTP000::tProtocolDataUnit;
@@ -44,6 +46,9 @@ void SimulatedNetwork::send(tProtocolDataUnit& unit, tStatus& status) {
     if (status.failed()) {
         return;
     }
+    // The network and the clocks stand for other machines: a test that makes the client's
+    // allocations fail does not reach theirs.
+    const AllocationFailurePause otherMachines;
     try {
         std::vector<SimulatedClock*> clocks;
         {
