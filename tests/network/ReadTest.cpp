@@ -257,8 +257,8 @@ void expectDescriptions(const Reading& r) {
 }
 
 // Brings up the clock, finds it and hands the reading to `check`.
-void withClock(const std::string& spec, const std::function<void(const Reading&)>& check) {
-    TestNetwork network({spec});
+void withClock(const std::string& clockSpec, const std::function<void(const Reading&)>& check) {
+    TestNetwork network({clockSpec});
     ASSERT_TRUE(network.isUp()) << network.failure();
     ManagementClient client(network.clientNamespace());
     ASSERT_TRUE(client.isOpen()) << client.failure();

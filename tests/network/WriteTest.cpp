@@ -24,7 +24,7 @@ std::string describe(const tStatus& status) {
 
 // A network of one clock, the client and the proxy of that clock.
 struct OneClock {
-    explicit OneClock(const std::string& spec) : network({spec}) {
+    explicit OneClock(const std::string& clockSpec) : network({clockSpec}) {
         if (!network.isUp()) {
             return;
         }

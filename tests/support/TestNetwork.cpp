@@ -97,8 +97,8 @@ CommandResult runCommand(const std::string& commandLine) {
 
 TestNetwork::TestNetwork(const std::vector<std::string>& clockSpecs) : prefix_(uniquePrefix()) {
     std::string command = shellQuoted(toolPath()) + " up " + prefix_;
-    for (const auto& spec : clockSpecs) {
-        command += " " + shellQuoted(spec);
+    for (const auto& clockSpec : clockSpecs) {
+        command += " " + shellQuoted(clockSpec);
     }
     started_ = true;
     const CommandResult result = runCommand(command);
