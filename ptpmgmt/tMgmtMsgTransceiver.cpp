@@ -66,7 +66,12 @@ void tMgmtMsgTransceiver::stop(tStatus& status) {
     transport_->abortReceive(scratch);
     status.merge(scratch);
     scratch.reset();
-    transport_->close(scratch);
+    {
+        // A send in progress finishes before its socket is closed, and none starts after:
+        // a descriptor closed under sendto may already belong to another part of the process.
+        nQVTARN000::tMutex::tGuard sending(sendLock_, scratch);
+        transport_->close(scratch);
+    }
     status.merge(scratch);
     running_.store(false);
     threadController_.join();
@@ -81,6 +86,9 @@ std::uint16_t tMgmtMsgTransceiver::sendRequest(tManagementMessage& message, tSta
         return 0;
     }
     nQVTARN000::tMutex::tGuard sending(sendLock_, status);
+    if (stopRequested_.load()) {
+        return 0;  // stop came while this caller waited for the lock: the transport is closing
+    }
     const auto sequenceId = static_cast<std::uint16_t>(nextSequenceId_);
     nQVPTP000::tMessageHeader* header = message.getHeader();
     if (header != nullptr) {

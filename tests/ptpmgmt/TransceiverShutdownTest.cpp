@@ -1,0 +1,97 @@
+#include <gtest/gtest.h>
+
+#include <atomic>
+#include <chrono>
+#include <condition_variable>
+#include <mutex>
+#include <thread>
+
+#include "ptp/transport/iPTPPortMessaging.h"
+#include "ptpmgmt/tMgmtMsgTransceiver.h"
+#include "tests/ptpmgmt/ClientTestSupport.h"
+
+using nQVPTP000::tManagementMessagePayload;
+using nQVPTP000::tProtocolDataUnit;
+using nQVPTPMGMT000::tMgmtMsgTransceiver;
+using namespace std::chrono_literals;
+
+namespace {
+
+// A transport whose send blocks until released, and which notes whether it was closed while
+// a send was still inside it (a socket closed under sendto).
+class HeldSendTransport final : public nQVPTP000::iPTPPortMessaging {
+  public:
+    void open(tStatus&) override { aborted_ = false; }
+    void close(tStatus&) override {
+        closed_ = true;
+        if (sending_) {
+            closedDuringSend_ = true;
+        }
+    }
+    void sendEventMessage(tProtocolDataUnit&, tStatus&) override {}
+    void sendGeneralMessage(tProtocolDataUnit&, tStatus&) override {
+        sending_ = true;
+        std::unique_lock<std::mutex> guard(lock_);
+        released_.wait(guard, [this] { return release_; });
+        sending_ = false;
+    }
+    void receive(tProtocolDataUnit&, tStatus& status) override {
+        while (!aborted_) {
+            std::this_thread::sleep_for(1ms);
+        }
+        QV_STATUS_SET(status, kStatusAborted, kComponentCodec);
+    }
+    void abortReceive(tStatus&) override { aborted_ = true; }
+    nQVPTP000::tPortAddress getPortAddress() override { return {}; }
+
+    void releaseSend() {
+        {
+            const std::lock_guard<std::mutex> guard(lock_);
+            release_ = true;
+        }
+        released_.notify_all();
+    }
+
+    std::atomic<bool> sending_{false};
+    std::atomic<bool> closed_{false};
+    std::atomic<bool> closedDuringSend_{false};
+
+  private:
+    std::atomic<bool> aborted_{false};
+    std::mutex lock_;
+    std::condition_variable released_;
+    bool release_ = false;
+};
+
+TEST(TransceiverShutdownTest, StopClosesTheTransportOnlyAfterASendInProgressHasFinished) {
+    HeldSendTransport transport;
+    tStatus status;
+    tMgmtMsgTransceiver transceiver(&transport, qvtest::clientIdentity(), qvtest::kClientPort,
+                                    status);
+    transceiver.start(status);
+    ASSERT_TRUE(status.succeeded());
+
+    std::thread sender([&] {
+        tStatus sendStatus;
+        auto request = qvtest::nullRequest(tManagementMessagePayload::kGet);
+        transceiver.sendRequest(*request, sendStatus);
+    });
+    while (!transport.sending_) {
+        std::this_thread::sleep_for(1ms);
+    }
+    std::thread stopper([&] {
+        tStatus stopStatus;
+        transceiver.stop(stopStatus);
+    });
+    // Long enough for an unguarded stop to reach close while the send is held.
+    std::this_thread::sleep_for(100ms);
+    EXPECT_FALSE(transport.closed_);
+    transport.releaseSend();
+    sender.join();
+    stopper.join();
+    EXPECT_TRUE(transport.closed_);
+    EXPECT_FALSE(transport.closedDuringSend_);
+    EXPECT_FALSE(transceiver.isRunning());
+}
+
+}  // namespace
