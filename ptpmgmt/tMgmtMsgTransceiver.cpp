@@ -55,11 +55,20 @@ void tMgmtMsgTransceiver::start(tStatus& status) {
     running_.store(true);
     threadStatus_.reset();
     threadController_.start(this, threadStatus_);
+    if (threadStatus_.failed()) {
+        // Without its receive thread the transceiver would look started but never deliver
+        // an answer: the caller learns of the failure, and the transport is closed again.
+        status.merge(threadStatus_);
+        running_.store(false);
+        tStatus scratch;
+        transport_->close(scratch);
+    }
 }
 
 void tMgmtMsgTransceiver::stop(tStatus& status) {
-    if (!running_.load()) {
-        return;
+    bool running = true;
+    if (!running_.compare_exchange_strong(running, false)) {
+        return;  // not running, or another thread is stopping it
     }
     stopRequested_.store(true);
     tStatus scratch;
@@ -73,7 +82,6 @@ void tMgmtMsgTransceiver::stop(tStatus& status) {
         transport_->close(scratch);
     }
     status.merge(scratch);
-    running_.store(false);
     threadController_.join();
 }
 

@@ -73,8 +73,10 @@ void printClock(tPTPClockProxy& proxy) {
 }  // namespace
 
 int main(int argc, char** argv) {
-    const auto wait = static_cast<std::uint16_t>(
-        argc > 1 ? std::strtoul(argv[1], nullptr, 10) : qv::dsc::osdep::FindClocksTimeout::read());
+    // The wait is a 16-bit count of milliseconds, as the configured one is.
+    const unsigned long asked =
+        argc > 1 ? std::strtoul(argv[1], nullptr, 10) : qv::dsc::osdep::FindClocksTimeout::read();
+    const auto wait = static_cast<std::uint16_t>(asked > 0xFFFF ? 0xFFFF : asked);
     tStatus status;
     tUDPNetworkInterface transport;
     const auto identity = qv::dsc::osdep::EthernetAdapters::localClockIdentity();
