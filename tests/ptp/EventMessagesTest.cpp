@@ -2,7 +2,6 @@
 
 #include "ptp/tAnnounceMessage.h"
 #include "ptp/tDelayReqMessage.h"
-#include "ptp/tDelayRespMessage.h"
 #include "ptp/tFollowUpMessage.h"
 #include "ptp/tSignalingMessage.h"
 #include "tests/ptp/MessageTestSupport.h"
@@ -49,21 +48,6 @@ TEST(tAnnounceMessageTest, TraceShowsTheOffsetSignExtended) {
               "grandmasterPriority1: 128\n"
               "grandmasterPriority2: 128\n"
               "--- End Announce Message ---\n");
-}
-
-TEST(tDelayRespMessageTest, RequestingPortIdentityAtOffsetFortyFour) {
-    tStatus status;
-    const auto message = decodeMessage(headerHex("09", "00 36", "03") +
-                                           "00 00 5F 5E 10 00 | 00 00 00 07 |"  // receiveTimestamp
-                                           "02 11 22 FF FE 33 44 55 | 00 07",   // requesting port
-                                       status);
-    ASSERT_TRUE(status.succeeded());
-    const auto* response = dynamic_cast<const tDelayRespMessage*>(message.get());
-    ASSERT_NE(response, nullptr);
-    const std::uint8_t identity[] = {0x02, 0x11, 0x22, 0xFF, 0xFE, 0x33, 0x44, 0x55};
-    EXPECT_EQ(response->getRequestingPortIdentity(), tPortIdentity(tClockIdentity(identity), 7));
-    EXPECT_EQ(response->getReceiveTimestamp(), tTimestamp(0x5F5E1000, 7));
-    EXPECT_EQ(response->getSize(), 54);
 }
 
 TEST(tEventMessagesTest, EachTypeGetsItsClassAndDump) {
