@@ -15,11 +15,13 @@
 namespace {
 
 using nQVPTPMGMT000::tPTPClockProxy;
+using qvtest::describe;
 using qvtest::ManagementClient;
 using qvtest::pmcGet;
 using qvtest::pmcNumber;
 using qvtest::TestClock;
 using qvtest::TestNetwork;
+using qvtest::timeOf;
 using tValues = std::map<std::string, std::string>;
 
 // What pmc printed for one name, as a number; fails the test when pmc printed no such name.
@@ -72,7 +74,7 @@ class Reading {
         SCOPED_TRACE(id);
         tStatus status;
         const long ours = static_cast<long>(get(status));
-        EXPECT_TRUE(status.succeeded()) << status.code << " " << status.file << ":" << status.line;
+        EXPECT_TRUE(status.succeeded()) << describe(status);
         EXPECT_EQ(ours, number(pmc(id), name));
     }
 
@@ -195,7 +197,7 @@ void expectDataSets(const Reading& r) {
         EXPECT_EQ(ours.getTimeTraceable(), number(pmc, "timeTraceable"));
         EXPECT_EQ(ours.getFrequencyTraceable(), number(pmc, "frequencyTraceable"));
     }
-    EXPECT_TRUE(status.succeeded()) << status.code << " " << status.file << ":" << status.line;
+    EXPECT_TRUE(status.succeeded()) << describe(status);
 }
 
 std::string octetText(std::span<const std::uint8_t> octets) {
@@ -253,7 +255,7 @@ void expectDescriptions(const Reading& r) {
         EXPECT_EQ(std::string(cached), pmc.at("revisionData"));
         EXPECT_EQ(p.getProtocolAddress().getAddressField()[3], a[3]);
     }
-    EXPECT_TRUE(status.succeeded()) << status.code << " " << status.file << ":" << status.line;
+    EXPECT_TRUE(status.succeeded()) << describe(status);
 }
 
 // Brings up the clock, finds it and hands the reading to `check`.
@@ -268,14 +270,6 @@ void withClock(const std::string& clockSpec, const std::function<void(const Read
     check(Reading(network, network.clocks()[0], *proxies[0]));
 }
 
-template <typename Call>
-std::chrono::milliseconds failsQuickly(Call call, tStatus& status) {
-    const auto started = std::chrono::steady_clock::now();
-    call(status);
-    return std::chrono::duration_cast<std::chrono::milliseconds>(std::chrono::steady_clock::now() -
-                                                                 started);
-}
-
 TEST(Reading, EveryGetOfPtp4lAgreesWithPmc) {
     QV_REQUIRE_TEST_NETWORK("ptp4l", "pmc");
     withClock("ptp4l:domain=1:prio1=91:prio2=92:desc=reader", [](const Reading& r) {
@@ -284,16 +278,16 @@ TEST(Reading, EveryGetOfPtp4lAgreesWithPmc) {
         expectDescriptions(r);
         tStatus status;
         r.proxy().getNullManagement(status);
-        EXPECT_TRUE(status.succeeded()) << status.code << " " << status.file << ":" << status.line;
+        EXPECT_TRUE(status.succeeded()) << describe(status);
 
         // TIME and UTC_PROPERTIES are answered with an error status: the exchange fails on
         // that answer, long before the 5 s time-out.
         tStatus time;
-        const auto timeTook = failsQuickly([&](tStatus& s) { r.proxy().getTime(s); }, time);
+        const auto timeTook = timeOf([&](tStatus& s) { r.proxy().getTime(s); }, time);
         EXPECT_EQ(time.code, kStatusNoData);
         EXPECT_LT(timeTook, std::chrono::milliseconds(1000));
         tStatus utc;
-        const auto utcTook = failsQuickly([&](tStatus& s) { r.proxy().getUTCProperties(s); }, utc);
+        const auto utcTook = timeOf([&](tStatus& s) { r.proxy().getUTCProperties(s); }, utc);
         EXPECT_EQ(utc.code, kStatusNoData);
         EXPECT_LT(utcTook, std::chrono::milliseconds(1000));
     });
@@ -311,14 +305,14 @@ TEST(Reading, EveryGetOfPtpdAgreesWithPmc) {
         // UTC plus the clock's UTC offset).
         tStatus status;
         const auto utc = r.proxy().getUTCProperties(status);
-        EXPECT_TRUE(status.succeeded()) << status.code << " " << status.file << ":" << status.line;
+        EXPECT_TRUE(status.succeeded()) << describe(status);
         const tValues properties = r.pmc("TIME_PROPERTIES_DATA_SET");
         EXPECT_EQ(utc.getCurrentUtcOffset(), number(properties, "currentUtcOffset"));
         EXPECT_EQ(utc.getCurrentUtcOffsetValid(), number(properties, "currentUtcOffsetValid"));
         EXPECT_EQ(utc.getLeap61(), number(properties, "leap61"));
         EXPECT_EQ(utc.getLeap59(), number(properties, "leap59"));
         const auto time = r.proxy().getTime(status);
-        EXPECT_TRUE(status.succeeded()) << status.code << " " << status.file << ":" << status.line;
+        EXPECT_TRUE(status.succeeded()) << describe(status);
         const auto now = static_cast<long long>(std::time(nullptr));
         const auto seconds = static_cast<long long>(time.getSeconds());
         EXPECT_LE(std::llabs(seconds - utc.getCurrentUtcOffset() - now), 2) << seconds;

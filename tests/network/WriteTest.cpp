@@ -13,14 +13,12 @@
 namespace {
 
 using nQVPTPMGMT000::tPTPClockProxy;
+using qvtest::describe;
 using qvtest::ManagementClient;
 using qvtest::pmcGet;
 using qvtest::TestNetwork;
+using qvtest::timeOf;
 using namespace std::chrono_literals;
-
-std::string describe(const tStatus& status) {
-    return std::to_string(status.code) + " at " + status.file + ":" + std::to_string(status.line);
-}
 
 // A network of one clock, the client and the proxy of that clock.
 struct OneClock {
@@ -60,13 +58,6 @@ void expectSet(const OneClock& clock, const std::string& id, const std::string& 
     set(status);
     EXPECT_TRUE(status.succeeded()) << describe(status);
     EXPECT_EQ(clock.pmc(id, name), expected);
-}
-
-std::chrono::milliseconds timeOf(const std::function<void(tStatus&)>& call, tStatus& status) {
-    const auto started = std::chrono::steady_clock::now();
-    call(status);
-    return std::chrono::duration_cast<std::chrono::milliseconds>(std::chrono::steady_clock::now() -
-                                                                 started);
 }
 
 TEST(Writing, PtpdTakesEverySettableValue) {

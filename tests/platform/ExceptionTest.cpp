@@ -36,13 +36,6 @@ TEST(ExceptionTest, EachTypeHasItsTextAndCodeThroughTheBase) {
     EXPECT_EQ(os.osErrorCode(), 0U);
 }
 
-TEST(ExceptionTest, OSExceptionCopiesShareItsMessage) {
-    const OSException original("disk on fire", 7, "x", 1);
-    const OSException copy = original;  // NOLINT(performance-unnecessary-copy-initialization)
-    EXPECT_STREQ(copy.what(), "disk on fire");
-    EXPECT_EQ(copy.osErrorCode(), 7U);
-}
-
 TEST(WinErrorTest, MissingFileGivesCode7AndTextWithoutFullStop) {
     errno = ENOENT;
     const WinError error("Mutex", 12);

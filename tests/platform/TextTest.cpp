@@ -1,5 +1,6 @@
 #include <gtest/gtest.h>
 
+#include <cstring>
 #include <string>
 
 #include "platform/CodePage.h"
@@ -13,29 +14,29 @@ using qv::dsc::WString;
 using qv::dsc::exception::InvalidLocale;
 using qv::dsc::osdep::WinError;
 
-TEST(StringBaseTest, ShortTextIntoFullEnoughBufferKeepsIt) {
-    String text("0123456789abcdef");  // capacity 16
-    ASSERT_EQ(text.capacity(), 16U);
-    const char* before = text.c_str();
-    text = "0123456789";
-    EXPECT_EQ(text.c_str(), before);
-    EXPECT_EQ(text.capacity(), 16U);
-    EXPECT_EQ(text.length(), 10U);
-    EXPECT_STREQ(text.c_str(), "0123456789");
-}
-
-TEST(StringBaseTest, ShortTextIntoMostlyEmptyBufferReplacesIt) {
-    String text("0123456789abcdef0123456789abcdef");  // capacity 32
-    text = "0123456789";
-    EXPECT_EQ(text.capacity(), 10U);  // exactly the new length
-    EXPECT_STREQ(text.c_str(), "0123456789");
-}
-
-TEST(StringBaseTest, LongerTextGrowsToExactlyItsLength) {
-    String text("abc");
-    text = "abcdefgh";
-    EXPECT_EQ(text.capacity(), 8U);
-    EXPECT_STREQ(text.c_str(), "abcdefgh");
+// A shorter text keeps the buffer while it fills at least half of it; otherwise the buffer
+// is replaced by one of exactly the new length.
+TEST(StringBaseTest, AssignmentKeepsOrReplacesTheBuffer) {
+    struct Case {
+        const char* before;
+        const char* after;
+        std::size_t capacity;
+        bool sameBuffer;
+    } const cases[] = {
+        {"0123456789abcdef", "0123456789", 16, true},                   // full enough
+        {"0123456789abcdef0123456789abcdef", "0123456789", 10, false},  // mostly empty
+        {"abc", "abcdefgh", 8, false},                                  // longer
+    };
+    for (const Case& c : cases) {
+        String text(c.before);
+        ASSERT_EQ(text.capacity(), std::strlen(c.before));
+        const char* before = text.c_str();
+        text = c.after;
+        EXPECT_EQ(text.c_str() == before, c.sameBuffer) << c.before;
+        EXPECT_EQ(text.capacity(), c.capacity) << c.before;
+        EXPECT_EQ(text.length(), std::strlen(c.after));
+        EXPECT_STREQ(text.c_str(), c.after);
+    }
 }
 
 TEST(StringBaseTest, NullEmptyCopyAndSelfAssignment) {

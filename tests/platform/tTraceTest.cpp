@@ -34,18 +34,19 @@ TEST_F(tTraceTest, HeaderLongerThan49IsCut) {
     EXPECT_EQ(destination.text(), full.substr(0, 49) + "] \n");
 }
 
-TEST_F(tTraceTest, HeaderWithNoFieldsIsBlankWithoutBracket) {
-    trace.setFlag(tTrace::Flag::showComponent, false)
-        .setFlag(tTrace::Flag::showLine, false)
-        .setFlag(tTrace::Flag::showFile, false);
-    trace.beginLine("c", 1, "f", 0, 0).append("x").endLine();
-    EXPECT_EQ(destination.text(), std::string(49, ' ') + "x\n");
-}
-
-TEST_F(tTraceTest, OptionalFieldsFollowInTheirOrder) {
+// Version and code follow the default fields; with no field at all the header is blank.
+TEST_F(tTraceTest, OptionalFieldsFollowInTheirOrderAndNoFieldsGiveABlank) {
     trace.setFlag(tTrace::Flag::showVersion, true).setFlag(tTrace::Flag::showCode, true);
     trace.beginLine("c", 7, "f.cpp", -3, 0).endLine();
     EXPECT_EQ(destination.text(), padded("[c--v1.0--7--f.cpp---3") + "\n");
+
+    destination.clear();
+    for (auto flag : {tTrace::Flag::showComponent, tTrace::Flag::showLine, tTrace::Flag::showFile,
+                      tTrace::Flag::showVersion, tTrace::Flag::showCode}) {
+        trace.setFlag(flag, false);
+    }
+    trace.beginLine("c", 1, "f", 0, 0).append("x").endLine();
+    EXPECT_EQ(destination.text(), std::string(49, ' ') + "x\n");
 }
 
 TEST_F(tTraceTest, LongPieceReachesDestinationInPiecesOf253) {

@@ -4,7 +4,6 @@
 #include "ptp/TLVs/tNullManagementTLV.h"
 #include "ptp/tManagementIdTable.h"
 #include "ptp/tManagementMessage.h"
-#include "ptp/tSyncMessage.h"
 #include "tests/ptp/MessageTestSupport.h"
 #include "tests/support/FailingAllocation.h"
 
@@ -72,18 +71,6 @@ TEST(tPTPMessageFactoryTest, NothingIsDoneAfterAnEarlierError) {
     status.set(kStatusSocketError, "x", "y", 1);
     EXPECT_EQ(decodeMessage(managementHex("00 36", kNullTlv), status), nullptr);
     EXPECT_EQ(status.code, kStatusSocketError);
-}
-
-TEST(tPTPMessageFactoryTest, SyncOfFortyFourOctets) {
-    tStatus status;
-    const auto message =
-        decodeMessage(headerHex("00", "00 2C", "00") + "00 00 5F 5E 10 00 | 00 00 01 00", status);
-    ASSERT_TRUE(status.succeeded());
-    const auto* sync = dynamic_cast<const tSyncMessage*>(message.get());
-    ASSERT_NE(sync, nullptr);
-    EXPECT_EQ(sync->getSize(), 44);
-    EXPECT_EQ(sync->getSuffix()->getCount(), 0U);
-    EXPECT_EQ(sync->getOriginTimestamp(), tTimestamp(0x5F5E1000, 256));
 }
 
 TEST(tPTPMessageFactoryTest, NoAllocationFailureLeavesAHalfBuiltMessage) {

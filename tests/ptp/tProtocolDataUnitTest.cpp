@@ -22,25 +22,18 @@ class tProtocolDataUnitTest : public ::testing::Test {
     tProtocolDataUnit unit{status};
 };
 
-TEST_F(tProtocolDataUnitTest, NibblesPackHighFirst) {
+// Bit fields fill an octet from its high bit; a whole-octet field starts on the next octet.
+TEST_F(tProtocolDataUnitTest, BitFieldsPackFromTheHighBit) {
     unit.writeNibble(0xA, status);
     unit.writeNibble(0x5, status);
-    EXPECT_EQ(contents(unit), "A5");
-    EXPECT_EQ(unit.getLength(), 1U);
-}
-
-TEST_F(tProtocolDataUnitTest, WholeOctetFieldStartsOnNextOctet) {
     unit.writeBoolean(true, status);
     unit.writeUInteger16(0x1234, status);
-    EXPECT_EQ(contents(unit), "80 12 34");
-}
-
-TEST_F(tProtocolDataUnitTest, EightBooleansFillOneOctetFromBitSeven) {
     for (int i = 0; i < 7; ++i) {
         unit.writeBoolean(false, status);
     }
     unit.writeBoolean(true, status);
-    EXPECT_EQ(contents(unit), "01");
+    EXPECT_EQ(contents(unit), "A5 80 12 34 01");
+    EXPECT_EQ(unit.getLength(), 5U);
 }
 
 TEST_F(tProtocolDataUnitTest, BigEndianNumbersOfEveryWidth) {

@@ -89,16 +89,4 @@ TEST_F(SimulatedClockTest, MisbehavesAsToldAndLate) {
     EXPECT_EQ(clock_.requestsSeen(), 5U);
 }
 
-TEST(SimulatedClockScaleTest, AThousandPortsAnswerOneWildcardRequest) {
-    SimulatedClock clock(clockIdentity(1), 1000);
-    tStatus status;
-    tManagementMessage request(status);
-    request.setPayload(std::make_unique<nQVPTP000::tPriority1TLV>(), status);
-    const std::vector<std::uint8_t> octets = encodeMessage(request);
-    const auto answers = clock.answer(octets.data(), octets.size());
-    ASSERT_EQ(answers.size(), 1000U);
-    EXPECT_EQ(decodeManagement(answers[999].octets)->getHeader()->getSourcePortIdentity(),
-              tPortIdentity(clockIdentity(1), 1000));
-}
-
 }  // namespace

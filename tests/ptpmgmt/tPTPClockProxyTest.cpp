@@ -51,7 +51,7 @@ class tPTPClockProxyTest : public ProxyFixture {
     }
 };
 
-TEST_F(tPTPClockProxyTest, ClockTypeFlagsComeFromTheDescription) {
+TEST_F(tPTPClockProxyTest, ClockTypeAndAddressComeFromTheDescription) {
     EXPECT_TRUE(proxy().isOrdinaryClock());
     EXPECT_TRUE(proxy().isManagementNode());
     EXPECT_FALSE(proxy().isBoundaryClock());
@@ -59,6 +59,7 @@ TEST_F(tPTPClockProxyTest, ClockTypeFlagsComeFromTheDescription) {
     EXPECT_FALSE(proxy().isE2ETransparentClock());
     EXPECT_TRUE(otherPort_->isOrdinaryClock());
     EXPECT_FALSE(otherPort_->isManagementNode());
+    EXPECT_EQ(proxy().getProtocolAddress(), ipv4Address());
 }
 
 TEST_F(tPTPClockProxyTest, TextsNeedRoomForTheirTerminatingZero) {
@@ -113,10 +114,6 @@ TEST_F(tPTPClockProxyTest, OctetFieldsNeedTheirWholeSize) {
     EXPECT_EQ(std::vector<std::uint8_t>(octets, octets + 6),
               (std::vector<std::uint8_t>{0x00, 0x1B, 0x19, 0x00, 0x01, 0x00}));
     EXPECT_TRUE(status_.succeeded());
-}
-
-TEST_F(tPTPClockProxyTest, ProtocolAddressIsACopyOfTheDescribedOne) {
-    EXPECT_EQ(proxy().getProtocolAddress(), ipv4Address());
 }
 
 TEST_F(tPTPClockProxyTest, ClockKeyIsTheIdentityThenThePortNumberHighOctetFirst) {
@@ -180,17 +177,14 @@ TEST_F(tPTPClockProxyTest, RefreshReplacesTheCachedDescriptionOnSuccessOnly) {
     tStatus status;
     proxy().getProductDescription(product, sizeof(product), status);
     EXPECT_STREQ(product, "renamed");
-}
 
-TEST_F(tPTPClockProxyTest, ARefreshedDescriptionSurvivesALaterDiscovery) {
-    managed().port(1).productDescription = text("refreshed");
-    proxy().refreshClockDescription(status_);
+    // A later discovery replaces a refreshed description in turn.
+    clock_.setFault(Fault::none);
     managed().port(1).productDescription = text("rediscovered");
-    node_.findClocks(20, status_);
-    char product[16];
-    proxy().getProductDescription(product, sizeof(product), status_);
+    node_.findClocks(20, status);
+    proxy().getProductDescription(product, sizeof(product), status);
     EXPECT_STREQ(product, "rediscovered");
-    EXPECT_TRUE(status_.succeeded());
+    EXPECT_TRUE(status.succeeded());
 }
 
 }  // namespace

@@ -41,24 +41,6 @@ TEST(DataSetTLVTest, DefaultDataSetDefaults) {
     EXPECT_EQ(traceText(tlv), "tlvType 1 lengthField 22 managementId: 0x2000 ");
 }
 
-TEST(DataSetTLVTest, DefaultDataSetFlagsAndFields) {
-    tDefaultDataSetTLV tlv;
-    ASSERT_TRUE(decode(tlv,
-                       "00 01 00 16 20 00 | 03 | 00 | 00 04 | 7F | 06 21 43 65 | 80 |"
-                       "01 02 03 04 05 06 07 08 | 2A | 00")
-                    .succeeded());
-    EXPECT_TRUE(tlv.getSlaveOnly());
-    EXPECT_TRUE(tlv.getTwoStepFlag());
-    EXPECT_EQ(tlv.getNumberPorts(), 4);
-    EXPECT_EQ(tlv.getPriority1(), 0x7F);
-    EXPECT_EQ(tlv.getClockQuality().clockClass, 6);
-    EXPECT_EQ(tlv.getClockQuality().clockAccuracy, 0x21U);
-    EXPECT_EQ(tlv.getClockQuality().offsetScaledLogVariance, 0x4365);
-    EXPECT_EQ(tlv.getPriority2(), 0x80);
-    EXPECT_EQ(tlv.getClockIdentity()[7], 8);
-    EXPECT_EQ(tlv.getDomainNumber(), 42);
-}
-
 TEST(DataSetTLVTest, CurrentDataSetWireFormAndTrace) {
     tCurrentDataSetTLV tlv;
     ASSERT_TRUE(decode(tlv,

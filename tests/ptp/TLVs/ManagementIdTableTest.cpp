@@ -52,14 +52,6 @@ TEST(ManagementIdTableTest, CloneGivesAnEqualObjectOfTheSameClass) {
     }
 }
 
-TEST(ManagementIdTableTest, CloneWithoutMemoryRecordsNoMemory) {
-    const auto tlv = findManagementId(kParentDataSet)->create();
-    tStatus status;
-    qvtest::ScopedAllocationFailure failure(1);
-    EXPECT_EQ(tlv->clone(status), nullptr);
-    EXPECT_EQ(status.code, kStatusNoMemory);
-}
-
 TEST(ManagementIdTableTest, CloneKeepsAReceivedClockDescription) {
     Datagram datagram(
         "00 01 00 20 00 01 | 40 00 | 03 61 62 63 | 00 06 | 02 00 00 00 00 01 |"

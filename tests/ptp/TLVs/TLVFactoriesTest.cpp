@@ -1,7 +1,6 @@
 #include <gtest/gtest.h>
 
 #include "ptp/TLVs/tLXIConsortiumNotDefinedTLV.h"
-#include "ptp/TLVs/tManagementErrorStatusTLV.h"
 #include "ptp/tTLVFactory.h"
 #include "tests/ptp/PduTestSupport.h"
 
@@ -13,19 +12,6 @@ namespace {
 std::unique_ptr<tTLV> createFrom(std::string_view text, tStatus& status) {
     Datagram datagram(text);
     return tTLVFactory::createTLV(datagram.unit(), status);
-}
-
-TEST(tTLVFactoryTest, ErrorStatusWithoutDisplayData) {
-    tStatus status;
-    // MANAGEMENT_ERROR_STATUS | lengthField 8 | NO_SUCH_ID | DEFAULT_DATA_SET | reserved
-    const auto tlv = createFrom("00 02 | 00 08 | 00 02 | 20 00 | 00 00 00 00", status);
-    ASSERT_TRUE(status.succeeded());
-    const auto* error = dynamic_cast<const tManagementErrorStatusTLV*>(tlv.get());
-    ASSERT_NE(error, nullptr);
-    EXPECT_EQ(error->getManagementErrorId(), tManagementErrorStatusTLV::kNoSuchId);
-    EXPECT_EQ(error->getManagementId(), 0x2000);
-    EXPECT_EQ(error->getDisplayData().view(), "");
-    EXPECT_EQ(error->getLengthField(), 8);
 }
 
 TEST(tTLVFactoryTest, UnsupportedTypeIsSkippedWithItsLength) {

@@ -3,6 +3,8 @@
 
 #include <string>
 
+#include "tests/support/NetworkTestGuard.h"
+
 namespace qvtest {
 
 // Moves the calling thread, and every thread and process that it starts afterwards, into a
@@ -23,8 +25,7 @@ class PrivateNetwork {
     do {                                                                              \
         std::string qvReason;                                                         \
         if (!qvtest::PrivateNetwork::enter(qvReason)) {                               \
-            const char* qvCi = std::getenv("CI");                                     \
-            if (qvCi != nullptr && std::string(qvCi) == "true") {                     \
+            if (qvtest::runningUnderCi()) {                                           \
                 FAIL() << "private test network needed under CI: " << qvReason;       \
             }                                                                         \
             GTEST_SKIP() << "needs a private network namespace (root): " << qvReason; \
