@@ -14,9 +14,9 @@ namespace qvtest {
 using BagPtr = CQVComPtr<IkxSysPropertyBag2>;
 
 inline BagPtr newBag() {
-    CQVComObject<CkxDynamicPropertyBag>* created = nullptr;
-    EXPECT_EQ(CQVComObject<CkxDynamicPropertyBag>::CreateInstance(&created), S_OK);
-    return BagPtr(created);
+    IkxSysPropertyBag2* created = nullptr;
+    EXPECT_EQ(CQVComObject<CkxDynamicPropertyBag>::CreateReferenced(&created), S_OK);
+    return BagPtr::Adopt(created);
 }
 
 // Every tag that the enumerator still has, one Next at a time.
