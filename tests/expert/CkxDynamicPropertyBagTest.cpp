@@ -5,17 +5,36 @@
 #include <cstdlib>
 #include <ctime>
 #include <string>
+#include <vector>
 
+#include "expert/CQVComObject.h"
+#include "expert/CQVComPtr.h"
 #include "platform/BStr.h"
-#include "tests/expert/HostObjectsTestSupport.h"
 #include "tests/support/FailingAllocation.h"
 
-using namespace qvtest;
+using qvtest::ScopedAllocationFailure;
 using Bag = IkxSysPropertyBag2;
 using Tag = kxSysAttributeTagID;
 using Tags = std::vector<Tag>;
+using BagPtr = CQVComPtr<Bag>;
 
 namespace {
+
+BagPtr newBag() {
+    Bag* created = nullptr;
+    EXPECT_EQ(CQVComObject<CkxDynamicPropertyBag>::CreateReferenced(&created), S_OK);
+    return BagPtr::Adopt(created);
+}
+
+// Every tag that the enumerator still has, one Next at a time.
+Tags remainingTags(IkxSysEnumPropertyTag* tags) {
+    Tags found;
+    Tag tag = 0;
+    while (tags->Next(1, &tag, nullptr) == S_OK) {
+        found.push_back(tag);
+    }
+    return found;
+}
 
 constexpr Tag kTag = 0xE005000;
 constexpr GUID kGuid = {1, 2, 3, {4, 5, 6, 7, 8, 9, 10, 11}};
@@ -103,12 +122,17 @@ TEST(CkxDynamicPropertyBagTest, ChangedTagsAscendOutliveRemovalAndClearOnlyOnReq
     EXPECT_EQ(bag->HasTag(0xE006000), S_FALSE);
     ASSERT_EQ(bag->EnumerateChangedTags(changed.Receive()), S_OK);
     EXPECT_EQ(remainingTags(changed.get()), (Tags{0xE005000, 0xE006000, 0x80000000}));
-    // Values are kept in signed tag order.
+    // Values are kept in signed tag order. An enumerator goes on after the tag it delivered
+    // last whatever changed meanwhile, and keeps the bag alive.
     CQVComPtr<IkxSysEnumPropertyTag> values;
     ASSERT_EQ(bag->EnumerateTags(values.Receive()), S_OK);
-    EXPECT_EQ(remainingTags(values.get()), (Tags{0x80000000, 0xE005000}));
+    ASSERT_EQ(values->Skip(1), S_OK);
+    ASSERT_EQ(bag->RemoveTag(0xE005000), S_OK);
+    ASSERT_EQ(bag->SetULong(0xE007000, 7), S_OK);
     EXPECT_EQ(bag->ClearChangedTags(), S_OK);
     EXPECT_EQ(bag->ClearChangedTags(), S_FALSE);
+    bag.reset();
+    EXPECT_EQ(remainingTags(values.get()), Tags{0xE007000});
 }
 
 TEST(CkxDynamicPropertyBagTest, DateTimesConvertThroughLocalTimeFrom1970On) {
@@ -182,4 +206,16 @@ TEST(CkxDynamicPropertyBagTest, ExhaustedMemoryAnswersOutOfMemoryAndChangesNothi
             EXPECT_EQ(remainingTags(changed.get()), Tags{kTag});
         }
     }
+}
+
+TEST(CkxDynamicPropertyBagTest, BagAnswersItsIdentifiersWithOnePointerAndOneMoreReference) {
+    BagPtr bag = newBag();
+    void* answered = nullptr;
+    for (const IID* iid : {&IID_IUnknown, &IID_IkxSysPropertyBag, &IID_IkxSysPropertyBag2}) {
+        ASSERT_EQ(bag->QueryInterface(*iid, &answered), S_OK);
+        EXPECT_EQ(answered, bag.get());
+        EXPECT_EQ(bag->Release(), 1U);
+    }
+    EXPECT_EQ(bag->QueryInterface(IID_IkxSysEnumPropertyTag, &answered), E_NOINTERFACE);
+    EXPECT_EQ(answered, nullptr);
 }

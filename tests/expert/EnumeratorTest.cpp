@@ -4,16 +4,18 @@
 #include <memory>
 #include <new>
 #include <set>
+#include <stdexcept>
 #include <string>
 #include <vector>
 
+#include "expert/CQVComMultiThreadModelNoCS.h"
+#include "expert/CQVComObjectRootEx.h"
+#include "expert/CQVComPtr.h"
 #include "expert/CkxSysEnumItemNamesSTL.h"
 #include "expert/CkxSysEnumPropertyTagsSTL.h"
 #include "expert/QVCreateEnumerator.h"
 #include "platform/BStr.h"
-#include "tests/expert/HostObjectsTestSupport.h"
 
-using namespace qvtest;
 using NameList = std::list<std::u16string>;
 using Names = std::vector<std::u16string>;
 using Tags = std::vector<kxSysAttributeTagID>;
@@ -41,6 +43,17 @@ class CFailingNames : public IQVEnumOnSTLImpl<IkxSysEnumStringList, &IID_IkxSysE
         return kTable;
     }
     using IQVEnumOnSTLImpl::Adopt;
+};
+
+// An object whose construction fails as the expert's does when its mutex cannot be made.
+class CThrowingProbe : public IUnknown,
+                       public virtual CQVComObjectRootEx<CQVComMultiThreadModelNoCS> {
+  public:
+    static std::span<const QVInterfaceEntry> InterfaceTable() { return {}; }
+
+  protected:
+    CThrowingProbe() { throw std::runtime_error("no mutex"); }
+    virtual ~CThrowingProbe() = default;
 };
 
 template <class Enumerator, class Interface, class Container>
@@ -120,21 +133,7 @@ TEST(EnumeratorTest, NextOutOfMemoryGivesBackItsNamesAndKeepsThePosition) {
     EXPECT_EQ(next(*names, 3), (Names{u"a", u"b", u"c"}));
 }
 
-// The bag's enumerators keep the bag alive, and its changes cannot leave them dangling.
-TEST(EnumeratorTest, BagEnumeratorsHoldTheBagAndFollowItsChanges) {
-    BagPtr bag = newBag();
-    for (kxSysAttributeTagID tag : {1U, 2U, 3U}) {
-        ASSERT_EQ(bag->SetULong(tag, tag), S_OK);
-    }
-    CQVComPtr<IkxSysEnumPropertyTag> tags;
-    CQVComPtr<IkxSysEnumPropertyTag> clone;
-    ASSERT_EQ(bag->EnumerateTags(tags.Receive()), S_OK);
-    ASSERT_EQ(tags->Skip(1), S_OK);
-    ASSERT_EQ(bag->RemoveTag(2), S_OK);
-    ASSERT_EQ(bag->RemoveTag(3), S_OK);
-    ASSERT_EQ(bag->SetULong(4, 4), S_OK);
-    ASSERT_EQ(tags->Clone(clone.Receive()), S_OK);
-    bag.reset();
-    tags.reset();
-    EXPECT_EQ(remainingTags(clone.get()), Tags{4});
+TEST(CQVComObjectTest, ThrowingConstructionGivesOutOfMemory) {
+    CQVComObject<CThrowingProbe>* probe = nullptr;
+    EXPECT_EQ(CQVComObject<CThrowingProbe>::CreateInstance(&probe), E_OUTOFMEMORY);
 }
