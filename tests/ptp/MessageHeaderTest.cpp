@@ -1,7 +1,7 @@
 #include <gtest/gtest.h>
 
 #include "ptp/tMessageHeader.h"
-#include "tests/ptp/PduTestSupport.h"
+#include "tests/ptp/CodecTestSupport.h"
 
 using namespace nQVPTP000;
 using qvtest::Datagram;

@@ -10,7 +10,7 @@
 #include "ptp/tPortIdentity.h"
 #include "ptp/tTimeInterval.h"
 #include "ptp/tTimestamp.h"
-#include "tests/ptp/PduTestSupport.h"
+#include "tests/ptp/CodecTestSupport.h"
 #include "tests/support/FailingAllocation.h"
 
 using namespace nQVPTP000;

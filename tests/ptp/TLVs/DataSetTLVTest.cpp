@@ -7,7 +7,7 @@
 #include "ptp/TLVs/tPortDataSetTLV.h"
 #include "ptp/TLVs/tTimePropertiesDataSetTLV.h"
 #include "ptp/TLVs/tUserDescriptionTLV.h"
-#include "tests/ptp/PduTestSupport.h"
+#include "tests/ptp/CodecTestSupport.h"
 
 using namespace nQVPTP000;
 using qvtest::Datagram;

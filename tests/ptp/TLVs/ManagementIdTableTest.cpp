@@ -5,7 +5,7 @@
 
 #include "ptp/TLVs/tClockDescriptionTLV.h"
 #include "ptp/tManagementIdTable.h"
-#include "tests/ptp/PduTestSupport.h"
+#include "tests/ptp/CodecTestSupport.h"
 #include "tests/support/FailingAllocation.h"
 
 using namespace nQVPTP000;

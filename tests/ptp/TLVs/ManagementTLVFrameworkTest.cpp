@@ -4,7 +4,7 @@
 #include "ptp/TLVs/tNullManagementTLV.h"
 #include "ptp/iManagedClock.h"
 #include "ptp/tManagementIdTable.h"
-#include "tests/ptp/PduTestSupport.h"
+#include "tests/ptp/CodecTestSupport.h"
 #include "tests/support/ptp/InMemoryManagedClock.h"
 
 using namespace nQVPTP000;

@@ -25,7 +25,7 @@
 #include "ptp/TLVs/tUTCPropertiesTLV.h"
 #include "ptp/TLVs/tUserDescriptionTLV.h"
 #include "ptp/tManagementIdTable.h"
-#include "tests/ptp/PduTestSupport.h"
+#include "tests/ptp/CodecTestSupport.h"
 #include "tests/support/ptp/InMemoryManagedClock.h"
 
 using namespace nQVPTP000;

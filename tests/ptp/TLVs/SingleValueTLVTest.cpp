@@ -13,7 +13,7 @@
 #include "ptp/TLVs/tTraceabilityPropertiesTLV.h"
 #include "ptp/TLVs/tUTCPropertiesTLV.h"
 #include "ptp/TLVs/tVersionNumberTLV.h"
-#include "tests/ptp/PduTestSupport.h"
+#include "tests/ptp/CodecTestSupport.h"
 
 using namespace nQVPTP000;
 using qvtest::Datagram;

@@ -2,7 +2,7 @@
 
 #include "ptp/TLVs/tLXIConsortiumNotDefinedTLV.h"
 #include "ptp/tTLVFactory.h"
-#include "tests/ptp/PduTestSupport.h"
+#include "tests/ptp/CodecTestSupport.h"
 
 using namespace nQVPTP000;
 using qvtest::Datagram;
