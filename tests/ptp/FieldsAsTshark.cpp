@@ -2,7 +2,6 @@
 
 #include <cstdio>
 #include <cstdlib>
-#include <initializer_list>
 #include <span>
 
 #include "ptp/TLVs/tAnnounceReceiptTimeoutTLV.h"
@@ -45,99 +44,80 @@ namespace qvtest {
 
 namespace {
 
-using Pairs = std::initializer_list<std::pair<const char*, std::string>>;
-
-template <typename T>
-requires std::is_integral_v<T> std::string text(T value) {
-    return std::to_string(value);
-}
-std::string text(const tClockIdentity& identity) {
-    std::string digits = hexText(identity.getOctets(), tClockIdentity::kSize);
-    std::erase(digits, ' ');
-    return "0x" + digits;
-}
-std::string text(const tPTPText& value) {
-    return std::string(value.view());
-}
-// Octet strings as tshark shows them: "02:00:00:00:00:01".
-std::string text(std::span<const std::uint8_t> octets) {
-    std::string shown = hexText(octets.data(), octets.size());
-    for (char& c : shown) {
-        c = c == ' ' ? ':' : static_cast<char>(std::tolower(c));
+// A value in the form tshark shows it.
+struct Shown {
+    template <typename T>
+    requires std::is_integral_v<T> Shown(T number) : text(std::to_string(number)) {}
+    Shown(const tClockIdentity& identity) {
+        text = hexText(identity.getOctets(), tClockIdentity::kSize);
+        std::erase(text, ' ');
+        text.insert(0, "0x");
     }
-    return shown;
-}
-
-void add(TsharkFields& fields, const std::string& prefix, Pairs pairs) {
-    for (const auto& [name, value] : pairs) {
-        fields.emplace_back(prefix + name, value);
+    Shown(const tPTPText& value) : text(value.view()) {}
+    // Octet strings: "02:00:00:00:00:01".
+    template <std::size_t N>
+    Shown(std::span<const std::uint8_t, N> octets) : text(hexText(octets.data(), octets.size())) {
+        for (char& c : text) {
+            c = c == ' ' ? ':' : static_cast<char>(std::tolower(c));
+        }
     }
+    Shown(std::string shown) : text(std::move(shown)) {}
+    std::string text;
+};
+
+// Adds fields given as name, value, name, value...
+void add(TsharkFields& /*fields*/, const std::string& /*prefix*/) {}
+template <typename Value, typename... Rest>
+void add(TsharkFields& fields, const std::string& prefix, const char* name, const Value& value,
+         const Rest&... rest) {
+    fields.emplace_back(prefix + name, Shown(value).text);
+    add(fields, prefix, rest...);
 }
 
 void timestamp(TsharkFields& fields, const std::string& prefix, const tTimestamp& value) {
-    add(fields, prefix,
-        {{".seconds", text(value.getSeconds())}, {".nanoseconds", text(value.getNanoseconds())}});
+    add(fields, prefix, ".seconds", value.getSeconds(), ".nanoseconds", value.getNanoseconds());
 }
 
 // Scaled nanoseconds as tshark splits them: whole nanoseconds, and the fraction in decimal.
 void nanoseconds(TsharkFields& fields, const std::string& prefix, std::int64_t scaled) {
     char fraction[32];
     std::snprintf(fraction, sizeof fraction, "%.17g", static_cast<double>(scaled & 0xFFFF) / 65536);
-    add(fields, prefix, {{".ns", text(scaled >> 16)}, {".subns", fraction}});
+    add(fields, prefix, ".ns", scaled >> 16, ".subns", fraction);
 }
 
 void header(TsharkFields& fields, const tMessageHeader& h) {
     using F = tMessageHeader::tFlag;
-    add(fields, "ptp.v2.",
-        {{"majorsdoid", text(h.getTransportSpecific())},
-         {"messagetype", text(h.getMessageType())},
-         {"versionptp", text(h.getVersionPTP())},
-         {"messagelength", text(h.getMessageLength())},
-         {"domainnumber", text(h.getDomainNumber())},
-
-         {"clockidentity", text(h.getSourcePortIdentity().getClockIdentity())},
-         {"sourceportid", text(h.getSourcePortIdentity().getPortNumber())},
-         {"sequenceid", text(h.getSequenceId())},
-         {"controlfield", text(h.getControlField())},
-         {"logmessageperiod", text(h.getLogMessageInterval())}});
-    const std::pair<F, const char*> flags[] = {{F::secure, "security"},
-                                               {F::profileSpecific2, "specific2"},
-                                               {F::profileSpecific1, "specific1"},
-                                               {F::unicast, "unicast"},
-                                               {F::twoStep, "twostep"},
-                                               {F::alternateMaster, "alternatemaster"},
-                                               {F::frequencyTraceable, "frequencytraceable"},
-                                               {F::timeTraceable, "timetraceable"},
-                                               {F::ptpTimescale, "timescale"},
-                                               {F::currentUtcOffsetValid, "utcreasonable"},
-                                               {F::leap59, "li59"},
-                                               {F::leap61, "li61"}};
+    add(fields, "ptp.v2.", "majorsdoid", h.getTransportSpecific(), "messagetype",
+        h.getMessageType(), "versionptp", h.getVersionPTP(), "messagelength", h.getMessageLength(),
+        "domainnumber", h.getDomainNumber(), "clockidentity",
+        h.getSourcePortIdentity().getClockIdentity(), "sourceportid",
+        h.getSourcePortIdentity().getPortNumber(), "sequenceid", h.getSequenceId(), "controlfield",
+        h.getControlField(), "logmessageperiod", h.getLogMessageInterval());
+    add(fields, "ptp.v2.flags.", "security", h.getFlag(F::secure), "specific2",
+        h.getFlag(F::profileSpecific2), "specific1", h.getFlag(F::profileSpecific1), "unicast",
+        h.getFlag(F::unicast), "twostep", h.getFlag(F::twoStep), "alternatemaster",
+        h.getFlag(F::alternateMaster), "frequencytraceable", h.getFlag(F::frequencyTraceable),
+        "timetraceable", h.getFlag(F::timeTraceable), "timescale", h.getFlag(F::ptpTimescale),
+        "utcreasonable", h.getFlag(F::currentUtcOffsetValid), "li59", h.getFlag(F::leap59), "li61",
+        h.getFlag(F::leap61));
     nanoseconds(fields, "ptp.v2.correction", h.getCorrectionField());
-    for (const auto& [flag, name] : flags) {
-        add(fields, "ptp.v2.flags.", {{name, text(h.getFlag(flag))}});
-    }
 }
 
 void announce(TsharkFields& fields, const tAnnounceMessage& a) {
     const tClockQuality& quality = a.getGrandmasterClockQuality();
     timestamp(fields, "ptp.v2.an.origintimestamp", a.getOriginTimestamp());
-    add(fields, "ptp.v2.an.",
-        {{"origincurrentutcoffset", text(a.getCurrentUtcOffset())},
-         {"priority1", text(a.getGrandmasterPriority1())},
-         {"grandmasterclockclass", text(quality.clockClass)},
-         {"grandmasterclockaccuracy", text(quality.clockAccuracy)},
-         {"grandmasterclockvariance", text(quality.offsetScaledLogVariance)},
-         {"priority2", text(a.getGrandmasterPriority2())},
-         {"grandmasterclockidentity", text(a.getGrandmasterIdentity())},
-         {"localstepsremoved", text(a.getStepsRemoved())}});
-    add(fields, "ptp.v2.", {{"timesource", text(a.getTimeSource())}});
+    add(fields, "ptp.v2.an.", "origincurrentutcoffset", a.getCurrentUtcOffset(), "priority1",
+        a.getGrandmasterPriority1(), "grandmasterclockclass", quality.clockClass,
+        "grandmasterclockaccuracy", quality.clockAccuracy, "grandmasterclockvariance",
+        quality.offsetScaledLogVariance, "priority2", a.getGrandmasterPriority2(),
+        "grandmasterclockidentity", a.getGrandmasterIdentity(), "localstepsremoved",
+        a.getStepsRemoved());
+    add(fields, "ptp.v2.", "timesource", a.getTimeSource());
 }
 
 void quality(TsharkFields& fields, const std::string& prefix, const tClockQuality& q) {
-    add(fields, "ptp.v2.mm." + prefix,
-        {{"clockclass", text(q.clockClass)},
-         {"clockaccuracy", text(q.clockAccuracy)},
-         {"clockvariance", text(q.offsetScaledLogVariance)}});
+    add(fields, "ptp.v2.mm." + prefix, "clockclass", q.clockClass, "clockaccuracy", q.clockAccuracy,
+        "clockvariance", q.offsetScaledLogVariance);
 }
 
 // Calls `describe` with the TLV when it is a T.
@@ -152,121 +132,91 @@ bool as(const tTLV& tlv, Describe describe) {
 
 void clockDescription(TsharkFields& f, const tClockDescriptionTLV& t) {
     const tPortAddress address = t.getProtocolAddress();
-    add(f, "ptp.v2.mm.",
-        {{"clockType.OC", text(t.getOrdinaryClock())},
-         {"clockType.BC", text(t.getBoundaryClock())},
-         {"clockType.p2p_TC", text(t.getP2pTransparentClock())},
-         {"clockType.e2e_TC", text(t.getE2eTransparentClock())},
-         {"clockType.MM", text(t.getManagementNode())},
-         {"physicalLayerProtocol", text(t.getPhysicalLayerProtocol())},
-         {"physicalAddressLength", text(t.getPhysicalAddressLength())},
-         {"physicalAddress", text(t.getPhysicalAddress())},
-         {"networkProtocol", text(address.getNetworkProtocol())},
-         {"protocolAddress",
-          text(std::span(address.getAddressField(), address.getAddressLength()))},
-         {"manufacturerIdentity", text(t.getManufacturerIdentity())},
-         {"productDescription", text(t.getProductDescription())},
-         {"revisionData", text(t.getRevisionData())},
-         {"userDescription", text(t.getUserDescription())},
-         {"profileIdentity", text(t.getProfileIdentity())}});
+    add(f, "ptp.v2.mm.", "clockType.OC", t.getOrdinaryClock(), "clockType.BC", t.getBoundaryClock(),
+        "clockType.p2p_TC", t.getP2pTransparentClock(), "clockType.e2e_TC",
+        t.getE2eTransparentClock(), "clockType.MM", t.getManagementNode(), "physicalLayerProtocol",
+        t.getPhysicalLayerProtocol(), "physicalAddressLength", t.getPhysicalAddressLength(),
+        "physicalAddress", t.getPhysicalAddress(), "networkProtocol", address.getNetworkProtocol(),
+        "protocolAddress", std::span(address.getAddressField(), address.getAddressLength()),
+        "manufacturerIdentity", t.getManufacturerIdentity(), "productDescription",
+        t.getProductDescription(), "revisionData", t.getRevisionData(), "userDescription",
+        t.getUserDescription(), "profileIdentity", t.getProfileIdentity());
 }
 
 void faultLog(TsharkFields& f, const tFaultLogTLV& t) {
-    add(f, "ptp.v2.mm.", {{"numberOfFaultRecords", text(t.getNumberOfFaultRecords())}});
+    add(f, "ptp.v2.mm.", "numberOfFaultRecords", t.getNumberOfFaultRecords());
     for (const tFaultRecord& record : t.getFaultRecords()) {
-        add(f, "ptp.v2.mm.", {{"faultRecordLength", text(record.getFaultRecordLength())}});
+        add(f, "ptp.v2.mm.", "faultRecordLength", record.getFaultRecordLength());
         timestamp(f, "ptp.v2.mm.faultTime", record.getFaultTime());
-        add(f, "ptp.v2.mm.",
-            {{"severityCode", text(record.getSeverityCode())},
-             {"faultName", text(record.getFaultName())},
-             {"faultValue", text(record.getFaultValue())},
-             {"faultDescription", text(record.getFaultDescription())}});
+        add(f, "ptp.v2.mm.", "severityCode", record.getSeverityCode(), "faultName",
+            record.getFaultName(), "faultValue", record.getFaultValue(), "faultDescription",
+            record.getFaultDescription());
     }
 }
 
 void defaultDataSet(TsharkFields& f, const tDefaultDataSetTLV& t) {
     quality(f, "", t.getClockQuality());
-    add(f, "ptp.v2.mm.",
-        {{"twoStep", text(t.getTwoStepFlag())},
-         {"SlavOnly", text(t.getSlaveOnly())},
-         {"numberPorts", text(t.getNumberPorts())},
-         {"priority1", text(t.getPriority1())},
-         {"priority2", text(t.getPriority2())},
-         {"clockidentity", text(t.getClockIdentity())},
-         {"domainNumber", text(t.getDomainNumber())}});
+    add(f, "ptp.v2.mm.", "twoStep", t.getTwoStepFlag(), "SlavOnly", t.getSlaveOnly(), "numberPorts",
+        t.getNumberPorts(), "priority1", t.getPriority1(), "priority2", t.getPriority2(),
+        "clockidentity", t.getClockIdentity(), "domainNumber", t.getDomainNumber());
 }
 
 void parentDataSet(TsharkFields& f, const tParentDataSetTLV& t) {
     quality(f, "grandmaster", t.getGrandmasterClockQuality());
-    add(f, "ptp.v2.mm.",
-        {{"parentclockidentity", text(t.getParentPortIdentity().getClockIdentity())},
-         {"parentsourceportid", text(t.getParentPortIdentity().getPortNumber())},
-         {"parentstats", text(t.getParentStats())},
-         {"observedParentOffsetScaledLogVariance",
-          text(t.getObservedParentOffsetScaledLogVariance())},
-         {"observedParentClockPhaseChangeRate", text(t.getObservedParentClockPhaseChangeRate())},
-         {"grandmasterPriority1", text(t.getGrandmasterPriority1())},
-         {"grandmasterPriority2", text(t.getGrandmasterPriority2())},
-         {"grandmasterclockidentity", text(t.getGrandmasterIdentity())}});
+    add(f, "ptp.v2.mm.", "parentclockidentity", t.getParentPortIdentity().getClockIdentity(),
+        "parentsourceportid", t.getParentPortIdentity().getPortNumber(), "parentstats",
+        t.getParentStats(), "observedParentOffsetScaledLogVariance",
+        t.getObservedParentOffsetScaledLogVariance(), "observedParentClockPhaseChangeRate",
+        t.getObservedParentClockPhaseChangeRate(), "grandmasterPriority1",
+        t.getGrandmasterPriority1(), "grandmasterPriority2", t.getGrandmasterPriority2(),
+        "grandmasterclockidentity", t.getGrandmasterIdentity());
 }
 
 void portDataSet(TsharkFields& f, const tPortDataSetTLV& t) {
     nanoseconds(f, "ptp.v2.mm.peerMeanPathDelay", t.getPeerMeanPathDelay().getScaledNanoseconds());
-    add(f, "ptp.v2.mm.",
-        {{"clockidentity", text(t.getPortIdentity().getClockIdentity())},
-         {"PortNumber", text(t.getPortIdentity().getPortNumber())},
-         {"portState", text(t.getPortState())},
-         {"logMinDelayReqInterval", text(t.getLogMinDelayReqInterval())},
-         {"logAnnounceInterval", text(t.getLogAnnounceInterval())},
-         {"announceReceiptTimeout", text(t.getAnnounceReceiptTimeout())},
-         {"logSyncInterval", text(t.getLogSyncInterval())},
-         {"delayMechanism", text(t.getDelayMechanism())},
-         {"logMinPdelayReqInterval", text(t.getLogMinPdelayReqInterval())},
-         {"versionNumber", text(t.getVersionNumber())}});
+    add(f, "ptp.v2.mm.", "clockidentity", t.getPortIdentity().getClockIdentity(), "PortNumber",
+        t.getPortIdentity().getPortNumber(), "portState", t.getPortState(),
+        "logMinDelayReqInterval", t.getLogMinDelayReqInterval(), "logAnnounceInterval",
+        t.getLogAnnounceInterval(), "announceReceiptTimeout", t.getAnnounceReceiptTimeout(),
+        "logSyncInterval", t.getLogSyncInterval(), "delayMechanism", t.getDelayMechanism(),
+        "logMinPdelayReqInterval", t.getLogMinPdelayReqInterval(), "versionNumber",
+        t.getVersionNumber());
 }
 
 // UTC_PROPERTIES, TIME_PROPERTIES_DATA_SET and the two properties TLVs share field names.
 template <typename T>
 void utc(TsharkFields& f, const T& t) {
-    add(f, "ptp.v2.mm.",
-        {{"currentutcoffset", text(t.getCurrentUtcOffset())},
-         {"li61", text(t.getLeap61())},
-         {"li59", text(t.getLeap59())},
-         {"CurrentUTCOffsetValid", text(t.getCurrentUtcOffsetValid())}});
+    add(f, "ptp.v2.mm.", "currentutcoffset", t.getCurrentUtcOffset(), "li61", t.getLeap61(), "li59",
+        t.getLeap59(), "CurrentUTCOffsetValid", t.getCurrentUtcOffsetValid());
 }
 template <typename T>
 void traceability(TsharkFields& f, const T& t) {
-    add(f, "ptp.v2.mm.",
-        {{"timeTraceable", text(t.getTimeTraceable())},
-         {"frequencyTraceable", text(t.getFrequencyTraceable())}});
+    add(f, "ptp.v2.mm.", "timeTraceable", t.getTimeTraceable(), "frequencyTraceable",
+        t.getFrequencyTraceable());
 }
 template <typename T>
 void timescale(TsharkFields& f, const T& t) {
-    add(f, "ptp.v2.mm.",
-        {{"ptptimescale", text(t.getPtpTimescale())}, {"timesource", text(t.getTimeSource())}});
+    add(f, "ptp.v2.mm.", "ptptimescale", t.getPtpTimescale(), "timesource", t.getTimeSource());
 }
 
 void dataField(TsharkFields& f, const tTLV& tlv) {
     const std::string mm = "ptp.v2.mm.";
     // A single-value TLV: its one field.
     auto value = [&f, &mm](const char* name) {
-        return [&f, &mm, name](const auto& t) { add(f, mm, {{name, text(t.getValue())}}); };
+        return [&f, &mm, name](const auto& t) { add(f, mm, name, t.getValue()); };
     };
     as<tClockDescriptionTLV>(tlv, [&](const auto& t) { clockDescription(f, t); }) ||
-        as<tUserDescriptionTLV>(tlv,
-                                [&](const auto& t) {
-                                    add(f, mm, {{"userDescription", text(t.getUserDescription())}});
-                                }) ||
-        as<tInitializeTLV>(tlv,
-                           [&](const auto& t) {
-                               add(f, mm, {{"initializationKey", text(t.getInitializationKey())}});
-                           }) ||
+        as<tUserDescriptionTLV>(
+            tlv, [&](const auto& t) { add(f, mm, "userDescription", t.getUserDescription()); }) ||
+        as<tInitializeTLV>(
+            tlv,
+            [&](const auto& t) { add(f, mm, "initializationKey", t.getInitializationKey()); }) ||
         as<tFaultLogTLV>(tlv, [&](const auto& t) { faultLog(f, t); }) ||
         as<tDefaultDataSetTLV>(tlv, [&](const auto& t) { defaultDataSet(f, t); }) ||
         as<tCurrentDataSetTLV>(
             tlv,
             [&](const auto& t) {
-                add(f, mm, {{"stepsRemoved", text(t.getStepsRemoved())}});
+                add(f, mm, "stepsRemoved", t.getStepsRemoved());
                 nanoseconds(f, mm + "offset", t.getOffsetFromMaster().getScaledNanoseconds());
                 nanoseconds(f, mm + "pathDelay", t.getMeanPathDelay().getScaledNanoseconds());
             }) ||
@@ -295,24 +245,21 @@ void dataField(TsharkFields& f, const tTLV& tlv) {
 }
 
 void management(TsharkFields& f, const tManagementMessage& m) {
-    add(f, "ptp.v2.mm.",
-        {{"targetportidentity", text(m.getTargetPortIdentity().getClockIdentity())},
-         {"targetportid", text(m.getTargetPortIdentity().getPortNumber())},
-         {"startingboundaryhops", text(m.getStartingBoundaryHops())},
-         {"boundaryhops", text(m.getBoundaryHops())},
-         {"action", text(m.getActionField())}});
+    add(f, "ptp.v2.mm.", "targetportidentity", m.getTargetPortIdentity().getClockIdentity(),
+        "targetportid", m.getTargetPortIdentity().getPortNumber(), "startingboundaryhops",
+        m.getStartingBoundaryHops(), "boundaryhops", m.getBoundaryHops(), "action",
+        m.getActionField());
     tStatus status;
     for (std::size_t i = 0; i < m.getSuffix()->getCount(); ++i) {
         const tTLV* tlv = m.getSuffix()->getTLV(i, status);
-        add(f, "ptp.v2.mm.",
-            {{"tlvType", text(tlv->getTlvType())}, {"lengthField", text(tlv->getLengthField())}});
+        add(f, "ptp.v2.mm.", "tlvType", tlv->getTlvType(), "lengthField", tlv->getLengthField());
         if (const auto* payload = dynamic_cast<const tManagementMessagePayload*>(tlv)) {
-            add(f, "ptp.v2.mm.", {{"managementId", text(payload->getManagementId())}});
+            add(f, "ptp.v2.mm.", "managementId", payload->getManagementId());
         }
         if (const auto* error = dynamic_cast<const tManagementErrorStatusTLV*>(tlv)) {
-            add(f, "ptp.v2.mm.", {{"managementErrorId", text(error->getManagementErrorId())}});
+            add(f, "ptp.v2.mm.", "managementErrorId", error->getManagementErrorId());
             if (error->getDisplayData().getLengthField() != 0) {
-                add(f, "ptp.v2.mm.", {{"displayData", text(error->getDisplayData())}});
+                add(f, "ptp.v2.mm.", "displayData", error->getDisplayData());
             }
         }
         dataField(f, *tlv);
@@ -337,36 +284,24 @@ TsharkFields fieldsAsTshark(const tPTPMessage& message) {
     } else if (const auto* r = dynamic_cast<const tDelayRespMessage*>(&message)) {
         timestamp(fields, "ptp.v2.dr.receivetimestamp", r->getReceiveTimestamp());
         const tPortIdentity& requesting = r->getRequestingPortIdentity();
-        add(fields, "ptp.v2.dr.",
-            {{"requestingsourceportidentity", text(requesting.getClockIdentity())},
-             {"requestingsourceportid", text(requesting.getPortNumber())}});
+        add(fields, "ptp.v2.dr.", "requestingsourceportidentity", requesting.getClockIdentity(),
+            "requestingsourceportid", requesting.getPortNumber());
     } else if (const auto* g = dynamic_cast<const tSignalingMessage*>(&message)) {
-        add(fields, "ptp.v2.sig.",
-            {{"targetportidentity", text(g->getTargetPortIdentity().getClockIdentity())},
-             {"targetportid", text(g->getTargetPortIdentity().getPortNumber())}});
+        add(fields, "ptp.v2.sig.", "targetportidentity",
+            g->getTargetPortIdentity().getClockIdentity(), "targetportid",
+            g->getTargetPortIdentity().getPortNumber());
     }
     return fields;
 }
 
 bool notModelled(const std::string& field) {
-    static const char* const kNames[] = {"ptp.v2.minorversionptp",
-                                         "ptp.v2.minorsdoid",
-                                         "ptp.v2.messagetypespecific",
-                                         "ptp.v2.clockidentity_manuf",
-                                         "ptp.v2.flags",
-                                         "ptp.v2.flags.synchronizationUncertain",
-                                         "ptp.v2.fu.preciseorigintimestamp.32bit",
-                                         "ptp.v2.mm.data",
-                                         "ptp.v2.mm.reserved",
-                                         "ptp.v2.mm.pad",
-                                         "ptp.v2.mm.clockType",
-                                         "ptp.v2.mm.clockType.reserved"};
-    for (const char* name : kNames) {
-        if (field == name) {
-            return true;
-        }
-    }
-    return field.ends_with(".length");  // a text's length octet: the text shows it
+    static const std::string kNames =
+        " ptp.v2.minorversionptp ptp.v2.minorsdoid ptp.v2.messagetypespecific ptp.v2.flags"
+        " ptp.v2.clockidentity_manuf ptp.v2.flags.synchronizationUncertain ptp.v2.mm.data"
+        " ptp.v2.fu.preciseorigintimestamp.32bit ptp.v2.mm.reserved ptp.v2.mm.pad"
+        " ptp.v2.mm.clockType ptp.v2.mm.clockType.reserved ";
+    // A text's length octet: the text shows it.
+    return kNames.find(" " + field + " ") != std::string::npos || field.ends_with(".length");
 }
 
 std::string comparable(const std::string& shown) {

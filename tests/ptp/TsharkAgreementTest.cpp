@@ -6,6 +6,7 @@
 #include <map>
 #include <set>
 #include <sstream>
+#include <typeinfo>
 
 #include "ptp/TLVs/tManagementErrorStatusTLV.h"
 #include "ptp/TLVs/tNullManagementTLV.h"
@@ -61,7 +62,7 @@ void expectSameFields(const qvtest::TsharkFields& ours, const qvtest::TsharkFiel
     }
 }
 
-// Each sample's length and round trip, and its fields as tshark decodes them.
+// Each sample's length, round trip and copies, and its fields as tshark decodes them.
 void expectAgreement(const std::vector<Sample>& samples) {
     std::vector<std::vector<std::uint8_t>> datagrams;
     for (const Sample& sample : samples) {
@@ -79,6 +80,13 @@ void expectAgreement(const std::vector<Sample>& samples) {
         ASSERT_NE(again, nullptr);
         EXPECT_EQ(qvtest::encode(*again), qvtest::hexText(sample.writtenBack));
         expectSameFields(qvtest::fieldsAsTshark(*sample.message), decoded[i]);
+        for (std::size_t t = 0; t < again->getSuffix()->getCount(); ++t) {
+            const tTLV& tlv = *again->getSuffix()->getTLV(t, status);
+            const auto copy = tlv.clone(status);
+            ASSERT_NE(copy, nullptr);
+            EXPECT_EQ(typeid(*copy), typeid(tlv));
+            EXPECT_EQ(qvtest::encode(*copy), qvtest::encode(tlv));
+        }
     }
 }
 
