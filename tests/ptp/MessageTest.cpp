@@ -1,6 +1,5 @@
 #include <gtest/gtest.h>
 
-#include "ptp/TLVs/tManagementErrorStatusTLV.h"
 #include "ptp/TLVs/tNullManagementTLV.h"
 #include "ptp/tManagementMessage.h"
 #include "tests/ptp/CodecTestSupport.h"
@@ -38,19 +37,6 @@ TEST(tMessageHeaderTest, MessageTypeSetsControlField) {
         EXPECT_EQ(header.getMessageType(), type);
         EXPECT_EQ(header.getControlField(), control) << type;
     }
-}
-
-TEST(tManagementMessageTest, SetPayloadReplacesThePayloadAndTheLength) {
-    tStatus status;
-    tManagementMessage message(status);
-    message.setPayload(std::make_unique<tNullManagementTLV>(), status);
-    message.setPayload(
-        std::make_unique<tManagementErrorStatusTLV>(0x2005, 0x0006, "Unsupported actionField"),
-        status);
-    ASSERT_TRUE(status.succeeded());
-    EXPECT_EQ(message.getSuffix()->getCount(), 1U);
-    EXPECT_EQ(message.getPayload(status)->getManagementId(), 0x2005);
-    EXPECT_EQ(message.getHeader()->getMessageLength(), 48 + 36);
 }
 
 TEST(tManagementMessageTest, AssignCopiesHeaderAndTLVsButNotTheBody) {

@@ -229,14 +229,14 @@ TEST(TsharkAgreementTest, DatagramsOurEncoderBuilt) {
     samples.push_back(
         written("GET NULL_MANAGEMENT",
                 build(tManagementMessagePayload::kGet, std::make_unique<tNullManagementTLV>())));
-    for (const char* text : {"ab", "abc"}) {
+    for (const char* text : {"ab", "abc"}) {  // with and without a pad
         tStatus status;
         auto description = std::make_unique<tUserDescriptionTLV>();
         description->setUserDescription(tPTPText(text, status), status);
         samples.push_back(written(std::string("SET USER_DESCRIPTION ") + text,
                                   build(tManagementMessagePayload::kSet, std::move(description))));
     }
-    for (const char* text : {"Unsupported actionField", "Even"}) {
+    for (const char* text : {"Unsupported actionField", "Even"}) {  // without and with a pad
         auto error = std::make_unique<tManagementErrorStatusTLV>(
             kPriority1, tManagementErrorStatusTLV::kNotSupported, text);
         samples.push_back(written(std::string("error status ") + text,

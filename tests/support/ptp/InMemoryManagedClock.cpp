@@ -2,8 +2,6 @@
 
 using nQVPTP000::tClockIdentity;
 using nQVPTP000::tPortIdentity;
-using nQVPTP000::tPTPText;
-using nQVPTP000::tTimestamp;
 
 namespace qvtest {
 
@@ -48,23 +46,11 @@ InMemoryManagedClock::Port* InMemoryManagedClock::find(Kind kind, std::uint16_t 
     return &ports[port - 1U];
 }
 
-std::uint16_t InMemoryManagedClock::getNumberPorts(tStatus& status) {
-    return read(static_cast<std::uint16_t>(ports.size()), status);
-}
-void InMemoryManagedClock::setClockAccuracy(std::uint8_t clockAccuracy, tStatus& status) {
-    write(defaultDataSet.clockQuality.clockAccuracy, std::uint32_t{clockAccuracy}, status);
-}
 std::span<const std::uint8_t> InMemoryManagedClock::getPhysicalAddress(std::uint16_t port,
                                                                        tStatus& status) {
     const Port* found = find(Kind::getter, port, status);
     return found != nullptr ? std::span<const std::uint8_t>(found->physicalAddress)
                             : std::span<const std::uint8_t>();
-}
-void InMemoryManagedClock::setUserDescription(const tPTPText& text, tStatus& status) {
-    write(userDescription, text, status);
-}
-void InMemoryManagedClock::setTime(const tTimestamp& newTime, tStatus& status) {
-    write(time, newTime, status);
 }
 
 void InMemoryManagedClock::enablePort(std::uint16_t port, tStatus& status) {

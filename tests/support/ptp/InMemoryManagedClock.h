@@ -169,11 +169,19 @@ class InMemoryManagedClock : public nQVPTP000::iManagedClock {
 #undef QV_PORT_GET
 #undef QV_PORT_GET_SET
 
-    std::uint16_t getNumberPorts(tStatus& status) override;
-    void setClockAccuracy(std::uint8_t clockAccuracy, tStatus& status) override;
+    std::uint16_t getNumberPorts(tStatus& s) override {
+        return read(static_cast<std::uint16_t>(ports.size()), s);
+    }
+    void setClockAccuracy(std::uint8_t a, tStatus& s) override {
+        write(defaultDataSet.clockQuality.clockAccuracy, std::uint32_t{a}, s);
+    }
     std::span<const std::uint8_t> getPhysicalAddress(std::uint16_t port, tStatus& status) override;
-    void setUserDescription(const nQVPTP000::tPTPText& text, tStatus& status) override;
-    void setTime(const nQVPTP000::tTimestamp& newTime, tStatus& status) override;
+    void setUserDescription(const nQVPTP000::tPTPText& t, tStatus& s) override {
+        write(userDescription, t, s);
+    }
+    void setTime(const nQVPTP000::tTimestamp& t, tStatus& s) override {
+        write(time, t, s);
+    }
     void enablePort(std::uint16_t port, tStatus& status) override;
     void disablePort(std::uint16_t port, tStatus& status) override;
     void initialize(std::uint16_t port, tStatus& status) override;
