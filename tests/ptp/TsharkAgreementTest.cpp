@@ -183,25 +183,27 @@ TEST(TsharkAgreementTest, DatagramsFromTheStandard) {
     for (const tManagementIdEntry& row : managementIdTable()) {
         EXPECT_EQ(names.count(row.name), 1U) << "no datagram for " << row.name;
     }
-    // transportSpecific 1, domain 5, every flag, correction 3 ns + 4/65536, sequence 0x0102,
-    // logMessageInterval -2.
-    auto header = [](const char* type, const char* length, const char* control) {
-        return std::string(type) + " 02 " + length +
-               " | 05 | 00 | E7 3F | 00 00 00 00 00 03 00 04 | 00 00 00 00 |"
-               "00 1B 21 FF FE 01 02 03 | 00 01 | 01 02 |" +
+    // transportSpecific 1, domain 5, correction 3 ns + 4/65536, sequence 0x0102,
+    // logMessageInterval -2. The flags of the four messages give each flag a pattern of its
+    // own, so that no two flags can trade places unseen.
+    auto header = [](const char* type, const char* length, const char* control, const char* flags) {
+        return std::string(type) + " 02 " + length + " | 05 | 00 | " + flags +
+               " | 00 00 00 00 00 03 00 04 | 00 00 00 00 | 00 1B 21 FF FE 01 02 03 | 00 01 |"
+               "01 02 |" +
                control + " | FE |";
     };
     // currentUtcOffset -2, grandmaster 0x06 0x21 0x4E5D priority 128 and 127, GPS.
     samples.push_back(received(
-        "Announce", qvtest::hexOctets(header("1B", "00 40", "05") +
+        "Announce", qvtest::hexOctets(header("1B", "00 40", "05", "A2 2A") +
                                       "00 00 00 00 00 09 | 00 00 00 0A | FF FE | 00 | 80 |"
                                       "06 21 4E 5D | 7F | 00 1B 21 FF FE 0A 0B 0C | 00 03 | 20")));
     // Seconds past 2^32 and the largest nanoseconds.
     const std::string timestamp = "00 01 02 03 04 05 | 3B 9A C9 FF";
-    samples.push_back(received("Sync", qvtest::hexOctets(header("10", "00 2C", "00") + timestamp)));
     samples.push_back(
-        received("Follow_Up", qvtest::hexOctets(header("18", "00 2C", "02") + timestamp)));
-    samples.push_back(received("Signaling", qvtest::hexOctets(header("1C", "00 2C", "05") +
+        received("Sync", qvtest::hexOctets(header("10", "00 2C", "00", "61 26") + timestamp)));
+    samples.push_back(
+        received("Follow_Up", qvtest::hexOctets(header("18", "00 2C", "02", "07 21") + timestamp)));
+    samples.push_back(received("Signaling", qvtest::hexOctets(header("1C", "00 2C", "05", "00 1F") +
                                                               "00 1B 21 FF FE 0A 0B 0C | 00 09")));
     expectAgreement(samples);
 }
