@@ -84,8 +84,9 @@ void expectAgreement(const std::vector<Sample>& samples) {
             const tTLV& tlv = *again->getSuffix()->getTLV(t, status);
             const auto copy = tlv.clone(status);
             ASSERT_NE(copy, nullptr);
-            EXPECT_EQ(typeid(*copy), typeid(tlv));
-            EXPECT_EQ(qvtest::encode(*copy), qvtest::encode(tlv));
+            const tTLV& copied = *copy;
+            EXPECT_EQ(typeid(copied), typeid(tlv));
+            EXPECT_EQ(qvtest::encode(copied), qvtest::encode(tlv));
         }
     }
 }
