@@ -68,18 +68,9 @@ TEST(TraceTextTest, TLVs) {
     const std::pair<const char*, const char*> rows[] = {
         {"00 01 00 04 20 08 | 01 | 00",
          "tlvType 1 lengthField 4 managementId: 0x2008 slaveOnly: true(1)\n"},
-        {"00 01 00 04 20 10 | FE | 00",
-         "tlvType 1 lengthField 4 managementId: 0x2010 clockAccuracy: 0xfe\n"},
-        {"00 01 00 06 20 11 | 00 25 | 07 | 00",
-         "tlvType 1 lengthField 6 managementId: 0x2011 currentUtcOffset: 37 "
-         "UTCV: true(1) LI59: true(1) LI61: true(1)\n"},
         {"00 01 00 0C 20 0F | 00 01 00 00 00 02 | 00 00 00 03",
          "tlvType 1 lengthField 12 managementId: 0x200f currentTime: "
          "secondsField: 4294967298 nanosecondsField: 3\n"},
-        {"00 01 00 04 00 05 | 12 34",
-         "tlvType 1 lengthField 4 managementId: 0x0005 initializationKey: 0x1234\n"},
-        {"00 01 00 06 00 02 | 02 61 62 | 00",
-         "tlvType 1 lengthField 6 managementId: 0x0002 user description: ab\n"},
         {"00 01 00 14 20 01 | 00 02 | FF FF FF FF FF FF 00 00 | 00 00 00 00 00 0A 00 00",
          "tlvType 1 lengthField 20 managementId: 0x2001 stepsRemoved2 "
          "offsetFromMasterscaledNanoseconds: -65536 meanPathDelayscaledNanoseconds: 655360\n"},
