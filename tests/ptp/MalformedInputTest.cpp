@@ -12,11 +12,11 @@ using namespace nQVPTP000;
 
 namespace {
 
-// A header with version 2 unless told otherwise: messageLength 54 (never compared with the
-// datagram), domain 0, no flags, source 001b21.fffe.010203-1, sequence 0x0102.
-std::string header(const char* type, const char* version = "02") {
-    return std::string(type) + " " + version +
-           " | 00 36 | 00 | 00 | 00 00 | 00 00 00 00 00 00 00 00 | 00 00 00 00 |"
+// A header: version 2 and messageLength 54 unless told otherwise (messageLength is never
+// compared with the datagram), domain 0, no flags, source 001b21.fffe.010203-1, sequence 0x0102.
+std::string header(const char* type, const char* version = "02", const char* length = "00 36") {
+    return std::string(type) + " " + version + " | " + length +
+           " | 00 | 00 | 00 00 | 00 00 00 00 00 00 00 00 | 00 00 00 00 |"
            "00 1B 21 FF FE 01 02 03 | 00 01 | 01 02 | 05 | 7F |";
 }
 
@@ -54,6 +54,9 @@ const std::vector<Row>& malformedDatagrams() {
         {"reserved actionField F", header("0D") + "FF FF FF FF FF FF FF FF FF FF | 00 00 0F 00",
          kStatusBadContent, ""},
         {"ACKNOWLEDGE", header("0D") + "FF FF FF FF FF FF FF FF FF FF | 00 00 04 00" + kNull, 0,
+         "0000"},
+        {"messageLength beyond the datagram",
+         header("0D", "02", "03 E8") + "FF FF FF FF FF FF FF FF FF FF | 00 00 00 00 |" + kNull, 0,
          "0000"},
         // The TLV list.
         {"no TLV", kGet, 0, ""},
