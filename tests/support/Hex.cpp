@@ -1,46 +1,25 @@
 #include "tests/support/Hex.h"
 
+#include <cctype>
 #include <stdexcept>
 
 namespace qvtest {
 
-namespace {
-
-int nibble(char c) {
-    if (c >= '0' && c <= '9') {
-        return c - '0';
-    }
-    if (c >= 'a' && c <= 'f') {
-        return c - 'a' + 10;
-    }
-    if (c >= 'A' && c <= 'F') {
-        return c - 'A' + 10;
-    }
-    return -1;
-}
-
-}  // namespace
-
 std::vector<std::uint8_t> hexOctets(std::string_view text) {
-    std::vector<std::uint8_t> octets;
-    int high = -1;
+    std::string digits;
     for (char c : text) {
-        if (c == ' ' || c == '\n' || c == '\t' || c == '|' || c == '\r') {
-            continue;
-        }
-        const int value = nibble(c);
-        if (value < 0) {
+        if (std::isxdigit(static_cast<unsigned char>(c)) != 0) {
+            digits += c;
+        } else if (std::string_view(" \n\t\r|").find(c) == std::string_view::npos) {
             throw std::invalid_argument("not a hex digit in test vector");
         }
-        if (high < 0) {
-            high = value;
-        } else {
-            octets.push_back(static_cast<std::uint8_t>(high * 16 + value));
-            high = -1;
-        }
     }
-    if (high >= 0) {
+    if (digits.size() % 2 != 0) {
         throw std::invalid_argument("odd number of hex digits in test vector");
+    }
+    std::vector<std::uint8_t> octets;
+    for (std::size_t i = 0; i < digits.size(); i += 2) {
+        octets.push_back(static_cast<std::uint8_t>(std::stoi(digits.substr(i, 2), nullptr, 16)));
     }
     return octets;
 }
@@ -49,9 +28,7 @@ std::string hexText(const std::uint8_t* octets, std::size_t count) {
     static const char digits[] = "0123456789ABCDEF";
     std::string text;
     for (std::size_t i = 0; i < count; ++i) {
-        if (i != 0) {
-            text += ' ';
-        }
+        text += i == 0 ? "" : " ";
         text += digits[octets[i] >> 4];
         text += digits[octets[i] & 0x0F];
     }

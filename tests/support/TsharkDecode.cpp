@@ -20,110 +20,92 @@ std::string attribute(const std::string& line, const std::string& name) {
     }
     const auto from = start + key.size();
     std::string text = line.substr(from, line.find('"', from) - from);
-    const std::pair<const char*, const char*> entities[] = {
+    const std::pair<std::string, std::string> entities[] = {
         {"&quot;", "\""}, {"&lt;", "<"}, {"&gt;", ">"}, {"&apos;", "'"}, {"&amp;", "&"}};
     for (const auto& [entity, plain] : entities) {
-        for (auto at = text.find(entity); at != std::string::npos; at = text.find(entity, at)) {
-            text.replace(at, std::char_traits<char>::length(entity), plain);
-            ++at;
+        for (auto at = text.find(entity); at != std::string::npos; at = text.find(entity, at + 1)) {
+            text.replace(at, entity.size(), plain);
         }
     }
     return text;
 }
 
-// A temporary folder removed with everything in it.
-class TemporaryFolder {
-  public:
-    TemporaryFolder() {
-        char pattern[] = "/tmp/qv-tshark-XXXXXX";
-        if (mkdtemp(pattern) == nullptr) {
-            throw std::runtime_error("cannot create a temporary folder");
-        }
-        path_ = pattern;
+template <typename T>
+void put(std::string& out, T value, bool bigEndian) {
+    for (std::size_t i = 0; i < sizeof(T); ++i) {
+        const std::size_t shift = 8 * (bigEndian ? sizeof(T) - 1 - i : i);
+        out += static_cast<char>((value >> shift) & 0xFF);
     }
-    ~TemporaryFolder() { std::system(("rm -rf '" + path_ + "'").c_str()); }
-    TemporaryFolder(const TemporaryFolder&) = delete;
-    TemporaryFolder& operator=(const TemporaryFolder&) = delete;
-    const std::string& path() const { return path_; }
+}
 
-  private:
-    std::string path_;
-};
+// A capture file of raw IPv4 packets (link type 101), host order little-endian.
+std::string captureFile(const std::vector<std::vector<std::uint8_t>>& datagrams) {
+    std::string file;
+    for (std::uint32_t word : {0xA1B2C3D4U, 0x00040002U, 0U, 0U, 65535U, 101U}) {
+        put(file, word, false);
+    }
+    for (const auto& datagram : datagrams) {
+        const auto udpLength = static_cast<std::uint16_t>(8 + datagram.size());
+        const std::uint16_t port = !datagram.empty() && (datagram[0] & 0x0F) < 8 ? 319 : 320;
+        std::string packet;
+        for (int half : {0x4500, udpLength + 20, 0, 0, 0x0111, 0, 0xA9FE, 0x0001, 0xE000, 0x0181,
+                         int{port}, int{port}, int{udpLength}, 0}) {
+            put(packet, static_cast<std::uint16_t>(half), true);
+        }
+        packet.append(datagram.begin(), datagram.end());
+        for (std::uint32_t word : {0U, 0U, static_cast<std::uint32_t>(packet.size()),
+                                   static_cast<std::uint32_t>(packet.size())}) {
+            put(file, word, false);
+        }
+        file += packet;
+    }
+    return file;
+}
 
 }  // namespace
 
-bool TsharkDecode::available() {
-    return std::system(
-               "command -v tshark >/dev/null 2>&1 && "
-               "command -v text2pcap >/dev/null 2>&1") == 0;
+bool tsharkAvailable() {
+    return std::system("command -v tshark >/dev/null 2>&1") == 0;
 }
 
-TsharkDecode::TsharkDecode(const std::vector<std::uint8_t>& datagram, std::uint16_t port) {
-    TemporaryFolder folder;
-    const std::string text = folder.path() + "/datagram.txt";
-    const std::string pcap = folder.path() + "/datagram.pcap";
-    {
-        std::ofstream out(text);
-        char octet[32];
-        for (std::size_t i = 0; i < datagram.size(); ++i) {
-            if (i % 16 == 0) {
-                std::snprintf(octet, sizeof(octet), "%s%04zx", i == 0 ? "" : "\n", i);
-                out << octet;
-            }
-            std::snprintf(octet, sizeof(octet), " %02x", datagram[i]);
-            out << octet;
-        }
-        out << "\n";
+std::vector<TsharkFields> tsharkDecode(const std::vector<std::vector<std::uint8_t>>& datagrams) {
+    char path[] = "/tmp/qv-tshark-XXXXXX";
+    const int descriptor = mkstemp(path);
+    if (descriptor < 0) {
+        throw std::runtime_error("cannot create a capture file");
     }
-    const std::string ports = std::to_string(port) + "," + std::to_string(port);
-    const std::string command = "text2pcap -q -4 169.254.0.1,224.0.1.129 -u " + ports + " '" +
-                                text + "' '" + pcap + "' 2>/dev/null && tshark -r '" + pcap +
-                                "' -T pdml 2>/dev/null";
+    close(descriptor);
+    std::ofstream(path, std::ios::binary) << captureFile(datagrams);
+    const std::string command = std::string("tshark -r ") + path + " -T pdml 2>/dev/null";
     std::unique_ptr<FILE, int (*)(FILE*)> pipe(popen(command.c_str(), "r"), pclose);
-    if (!pipe) {
-        throw std::runtime_error("cannot run tshark");
-    }
+    std::vector<TsharkFields> packets;
+    std::vector<std::string> open;  // the fields that enclose the current line
     std::string line;
-    char buffer[4096];
-    while (std::fgets(buffer, sizeof(buffer), pipe.get()) != nullptr) {
-        line += buffer;
-        if (line.back() != '\n') {
-            continue;  // a line longer than the buffer: keep reading it
+    for (int c = 0; pipe && (c = std::fgetc(pipe.get())) != EOF;) {
+        if (c != '\n') {
+            line += static_cast<char>(c);
+            continue;
         }
-        if (line.find("<field name=\"ptp.") != std::string::npos) {
-            fields_.push_back(
-                {attribute(line, "name"), attribute(line, "show"), attribute(line, "value")});
+        const std::string name = attribute(line, "name");
+        if (line.find("<packet>") != std::string::npos) {
+            packets.emplace_back();
+        } else if (line.find("</field>") != std::string::npos && !open.empty()) {
+            open.pop_back();
+        } else if (line.find("<field ") != std::string::npos) {
+            // A text shows again inside itself, under its length: keep it once.
+            const bool repeated = !open.empty() && open.back() == name;
+            const bool wanted = name.starts_with("ptp.") || name == "_ws.malformed";
+            if (wanted && !repeated && !packets.empty()) {
+                packets.back().emplace_back(name, attribute(line, "show"));
+            }
+            if (!line.ends_with("/>")) {
+                open.push_back(name);
+            }
         }
         line.clear();
     }
-}
-
-std::vector<std::string> TsharkDecode::shows(const std::string& name) const {
-    std::vector<std::string> found;
-    for (const Field& field : fields_) {
-        if (field.name == name) {
-            found.push_back(field.show);
-        }
-    }
-    return found;
-}
-
-std::string TsharkDecode::show(const std::string& name) const {
-    for (const Field& field : fields_) {
-        if (field.name == name) {
-            return field.show;
-        }
-    }
-    return "<absent>";
-}
-
-std::string TsharkDecode::value(const std::string& name) const {
-    for (const Field& field : fields_) {
-        if (field.name == name) {
-            return field.value;
-        }
-    }
-    return "<absent>";
+    std::remove(path);
+    return packets;
 }
 
 }  // namespace qvtest

@@ -3,39 +3,25 @@
 
 #include <cstdint>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "tests/support/NetworkTestGuard.h"
 
 namespace qvtest {
 
-// An independent decoding of one PTP datagram: the octets are wrapped in UDP/IPv4 with
-// text2pcap and dissected by tshark; every ptp.* field that tshark shows is kept with its
-// displayed value ("show") and its raw hex ("value").
-class TsharkDecode {
-  public:
-    struct Field {
-        std::string name;
-        std::string show;
-        std::string value;
-    };
+// tshark's fields of one datagram in datagram order: name ("ptp.v2.mm.priority1") and the
+// value it displays ("100", "0x0d", "IEEE 802.3"). "_ws.malformed" marks a datagram that
+// tshark found malformed.
+using TsharkFields = std::vector<std::pair<std::string, std::string>>;
 
-    // Whether tshark and text2pcap are installed.
-    static bool available();
+// Whether tshark is installed.
+bool tsharkAvailable();
 
-    explicit TsharkDecode(const std::vector<std::uint8_t>& datagram, std::uint16_t port = 320);
-
-    const std::vector<Field>& fields() const { return fields_; }
-    // The displayed values of every field of that name, in datagram order.
-    std::vector<std::string> shows(const std::string& name) const;
-    // The displayed value of the first field of that name, or "<absent>".
-    std::string show(const std::string& name) const;
-    // The raw hex of the first field of that name, or "<absent>".
-    std::string value(const std::string& name) const;
-
-  private:
-    std::vector<Field> fields_;
-};
+// An independent decoding of PTP datagrams: all of them go into one capture file (UDP/IPv4
+// from 169.254.0.1 to 224.0.1.129, port 319 for event messages and 320 for the others) that
+// one tshark process dissects. Starting tshark takes about a second: decode in one batch.
+std::vector<TsharkFields> tsharkDecode(const std::vector<std::vector<std::uint8_t>>& datagrams);
 
 }  // namespace qvtest
 
@@ -43,7 +29,7 @@ class TsharkDecode {
 // fails it under CI=true, where it must run.
 #define QV_REQUIRE_TSHARK()                                                     \
     do {                                                                        \
-        if (!qvtest::TsharkDecode::available()) {                               \
+        if (!qvtest::tsharkAvailable()) {                                       \
             if (qvtest::runningUnderCi()) {                                     \
                 FAIL() << "tshark is not installed, and CI must run this test"; \
             }                                                                   \

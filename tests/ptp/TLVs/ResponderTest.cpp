@@ -1,37 +1,17 @@
 #include <gtest/gtest.h>
 
-#include <memory>
-#include <string>
-
-#include "ptp/TLVs/tClockAccuracyTLV.h"
-#include "ptp/TLVs/tClockDescriptionTLV.h"
-#include "ptp/TLVs/tDefaultDataSetTLV.h"
-#include "ptp/TLVs/tDelayMechanismTLV.h"
-#include "ptp/TLVs/tDisablePortTLV.h"
-#include "ptp/TLVs/tEnablePortTLV.h"
-#include "ptp/TLVs/tFaultLogResetTLV.h"
-#include "ptp/TLVs/tFaultLogTLV.h"
-#include "ptp/TLVs/tInitializeTLV.h"
-#include "ptp/TLVs/tLogSyncIntervalTLV.h"
 #include "ptp/TLVs/tManagementErrorStatusTLV.h"
-#include "ptp/TLVs/tParentDataSetTLV.h"
-#include "ptp/TLVs/tPortDataSetTLV.h"
-#include "ptp/TLVs/tPriority2TLV.h"
-#include "ptp/TLVs/tSaveInNonVolatileStorageTLV.h"
-#include "ptp/TLVs/tSlaveOnlyTLV.h"
-#include "ptp/TLVs/tTimeTLV.h"
-#include "ptp/TLVs/tTimescalePropertiesTLV.h"
-#include "ptp/TLVs/tTraceabilityPropertiesTLV.h"
-#include "ptp/TLVs/tUTCPropertiesTLV.h"
-#include "ptp/TLVs/tUserDescriptionTLV.h"
 #include "ptp/tManagementIdTable.h"
-#include "tests/ptp/PduTestSupport.h"
+#include "tests/ptp/CodecTestSupport.h"
 #include "tests/support/ptp/InMemoryManagedClock.h"
 
+// The answers of the management TLVs to requests against a clock. The client's tests drive
+// the common reads and writes through a simulated clock; these rows hold what the client
+// cannot see: the octets of answers, the error ids and texts of refusals, and the clock's
+// failures. Rows run in order against one clock with two ports, so a SET shows in a later GET.
+
 using namespace nQVPTP000;
-using Answer = std::unique_ptr<tManagementMessagePayload>;
-using Error = tManagementErrorStatusTLV;
-using qvtest::Datagram;
+using Clock = qvtest::InMemoryManagedClock;
 
 namespace {
 
@@ -39,252 +19,146 @@ constexpr std::uint32_t kGet = tManagementMessagePayload::kGet;
 constexpr std::uint32_t kSet = tManagementMessagePayload::kSet;
 constexpr std::uint32_t kCommand = tManagementMessagePayload::kCommand;
 
-class ResponderTest : public ::testing::Test {
-  protected:
-    Answer ask(tManagementMessagePayload& request, std::uint32_t action, std::uint16_t port = 1) {
-        tStatus status;
-        Answer answer = request.respond(action, clock, port, status);
-        EXPECT_TRUE(status.succeeded());
-        return answer;
-    }
-    // "errorId text" of an error answer, "" for a TLV answer.
-    static std::string refusal(const Answer& answer) {
-        const auto* error = dynamic_cast<const Error*>(answer.get());
-        if (error == nullptr) {
-            return "";
-        }
-        return std::to_string(error->getManagementErrorId()) + " " +
-               std::string(error->getDisplayData().view());
-    }
-    template <typename T>
-    static const T& as(const Answer& answer) {
-        const auto* tlv = dynamic_cast<const T*>(answer.get());
-        EXPECT_NE(tlv, nullptr);
-        return *tlv;
-    }
-
-    qvtest::InMemoryManagedClock clock{2};
-    const std::string generalGet = std::to_string(Error::kGeneralError) + " Failure getting value";
-    const std::string generalSet = std::to_string(Error::kGeneralError) + " Failure setting value";
-    const std::string unsupported =
-        std::to_string(Error::kNotSupported) + " Unsupported actionField";
+struct Row {
+    const char* name;
+    std::uint32_t action;
+    std::uint16_t port;
+    const char* request;  // the TLV, tlvType onward
+    const char* answer;   // the answer's octets, or "error ID TEXT" for an error status
+    void (*prepare)(Clock&) = nullptr;
 };
 
-TEST_F(ResponderTest, DataSetGetsFillFromTheClock) {
-    clock.defaultDataSet.priority1 = 7;
-    clock.defaultDataSet.twoStepFlag = true;
-    clock.parentDataSet.grandmasterPriority2 = 9;
-    clock.port(2).logSyncInterval = -3;
-    clock.port(2).versionNumber = 2;
-
-    tDefaultDataSetTLV defaults;
-    const Answer a = ask(defaults, kGet);
-    EXPECT_EQ(as<tDefaultDataSetTLV>(a).getPriority1(), 7);
-    EXPECT_TRUE(as<tDefaultDataSetTLV>(a).getTwoStepFlag());
-    EXPECT_EQ(as<tDefaultDataSetTLV>(a).getNumberPorts(), 2);
-
-    tParentDataSetTLV parent;
-    EXPECT_EQ(as<tParentDataSetTLV>(ask(parent, kGet)).getGrandmasterPriority2(), 9);
-
-    tPortDataSetTLV port;
-    const Answer p = ask(port, kGet, 2);
-    EXPECT_EQ(as<tPortDataSetTLV>(p).getLogSyncInterval(), -3);
-    EXPECT_EQ(as<tPortDataSetTLV>(p).getPortIdentity().getPortNumber(), 2);
-    // A data set cannot be set as a whole.
-    EXPECT_EQ(refusal(ask(port, kSet)), unsupported);
+std::string answerText(const tManagementMessagePayload& answer) {
+    const auto* error = dynamic_cast<const tManagementErrorStatusTLV*>(&answer);
+    if (error == nullptr) {
+        return qvtest::encode(answer);
+    }
+    return "error " + std::to_string(error->getManagementErrorId()) + " " +
+           std::string(error->getDisplayData().view());
 }
 
-TEST_F(ResponderTest, ClockDescriptionGetCopiesTheAddressAndPads) {
-    tStatus status;
-    clock.port(1).physicalAddress = {2, 0, 0, 0, 0, 1};
-    clock.port(1).physicalLayerProtocol = tPTPText("IEEE 802.3", status);
-    clock.userDescription = tPTPText("alpha", status);
-    tClockDescriptionTLV tlv;
-    const Answer answer = ask(tlv, kGet);
-    const auto& description = as<tClockDescriptionTLV>(answer);
-    EXPECT_TRUE(description.getOrdinaryClock());
-    ASSERT_EQ(description.getPhysicalAddressLength(), 6);
-    EXPECT_NE(description.getPhysicalAddress().data(), clock.port(1).physicalAddress.data());
-    // 14 + 11 + 6 + 4 + 1 + 1 + 6 = 43 octets: odd, so padded; + managementId = 46
-    EXPECT_TRUE(description.getPadNeeded());
-    EXPECT_EQ(description.getLengthField(), 46);
-    EXPECT_EQ(description.getUserDescription().view(), "alpha");
-    // A port the clock does not have.
-    EXPECT_EQ(refusal(ask(tlv, kGet, 3)), generalGet);
+const Row kRows[] = {
+    {"SET PRIORITY1", kSet, 1, "00 01 00 04 20 05 | C8 | 00", "00 01 00 04 20 05 C8 00"},
+    {"SET PRIORITY2", kSet, 1, "00 01 00 04 20 06 | 21 | 00", "00 01 00 04 20 06 21 00"},
+    {"SET SLAVE_ONLY", kSet, 1, "00 01 00 04 20 08 | 01 | 00", "00 01 00 04 20 08 01 00"},
+    {"SET DOMAIN", kSet, 1, "00 01 00 04 20 07 | 05 | 00", "00 01 00 04 20 07 05 00"},
+    {"SET CLOCK_ACCURACY reserved", kSet, 1, "00 01 00 04 20 10 | 1F | 00",
+     "error 4 Unsupported clockAccuracy value"},
+    {"SET CLOCK_ACCURACY", kSet, 1, "00 01 00 04 20 10 | 31 | 00", "00 01 00 04 20 10 31 00"},
+    // slaveOnly | numberPorts 2 | priority1 | quality | priority2 | identity | domain
+    {"GET DEFAULT_DATA_SET", kGet, 1, "00 01 00 02 20 00",
+     "00 01 00 16 20 00 02 00 00 02 C8 BB 31 FF FF 21 02 00 00 FF FE 00 00 01 05 00"},
+    {"SET DEFAULT_DATA_SET", kSet, 1, "00 01 00 02 20 00", "error 6 Unsupported actionField"},
+    {"SET LOG_SYNC_INTERVAL port 2", kSet, 2, "00 01 00 04 20 0B | FE | 00",
+     "00 01 00 04 20 0B FE 00"},
+    {"SET DELAY_MECHANISM reserved", kSet, 2, "00 01 00 04 60 00 | 03 | 00",
+     "error 4 Unsupported delayMechanism value"},
+    {"SET DELAY_MECHANISM disabled", kSet, 2, "00 01 00 04 60 00 | FE | 00",
+     "00 01 00 04 60 00 FE 00"},
+    // identity:2 | state 1 | logMinDelayReqInterval 0 | peerMeanPathDelay 0 | announce 1,
+    // timeout 3 | logSyncInterval -2 | delayMechanism FE | logMinPdelayReqInterval 0 | v2
+    {"GET PORT_DATA_SET port 2", kGet, 2, "00 01 00 02 20 04",
+     "00 01 00 1C 20 04 02 00 00 FF FE 00 00 01 00 02 01 00 00 00 00 00 00 00 00 00 01 03 FE FE 00 "
+     "02"},
+    {"GET PORT_DATA_SET of a port the clock lacks", kGet, 3, "00 01 00 02 20 04",
+     "error 65534 Failure getting value"},
+    {"SET UTC_PROPERTIES", kSet, 1, "00 01 00 06 20 11 | FF FF | 05 | 00",
+     "00 01 00 06 20 11 FF FF 05 00"},
+    {"SET TRACEABILITY_PROPERTIES", kSet, 1, "00 01 00 04 20 12 | 10 | 00",
+     "00 01 00 04 20 12 10 00"},
+    // An unknown time source is refused, and ptpTimescale is applied all the same.
+    {"SET TIMESCALE_PROPERTIES unknown source", kSet, 1, "00 01 00 04 20 13 | 00 | 11",
+     "error 4 Unknown timeSource value"},
+    {"GET TIME_PROPERTIES_DATA_SET", kGet, 1, "00 01 00 02 20 03", "00 01 00 06 20 03 FF FF 15 A0"},
+    {"SET TIME", kSet, 1, "00 01 00 0C 20 0F | 00 00 00 00 03 E8 | 00 00 00 05",
+     "00 01 00 0C 20 0F 00 00 00 00 03 E8 00 00 00 05"},
+    {"GET TIME", kGet, 1, "00 01 00 0C 20 0F | 00 00 00 00 00 00 | 00 00 00 00",
+     "00 01 00 0C 20 0F 00 00 00 00 03 E8 00 00 00 05"},
+    {"SET TIME on a clock that is not grandmaster", kSet, 1,
+     "00 01 00 0C 20 0F | 00 00 00 00 07 D0 | 00 00 00 00",
+     "error 6 Cannot set time on non-grandmaster clock",
+     [](Clock& c) { c.parentDataSet.grandmasterIdentity = allOnesClockIdentity(); }},
+    {"SET USER_DESCRIPTION", kSet, 1, "00 01 00 08 00 02 | 05 72 61 63 6B 34",
+     "00 01 00 08 00 02 05 72 61 63 6B 34"},
+    // clockType OC | "IEEE 802.3" | physical address | protocol address of no protocol |
+    // manufacturer | reserved | product | revision | "rack4" | profile | pad
+    {"GET CLOCK_DESCRIPTION", kGet, 1, "00 01 00 02 00 01",
+     "00 01 00 2E 00 01 80 00 0A 49 45 45 45 20 38 30 32 2E 33 00 06 02 00 00 00 00 01 FF FE 00 00 "
+     "00 00 00 00 00 00 05 72 61 63 6B 34 00 00 00 00 00 00 00",
+     [](Clock& c) {
+         tStatus status;
+         c.port(1).physicalLayerProtocol = tPTPText("IEEE 802.3", status);
+         c.port(1).physicalAddress = {2, 0, 0, 0, 0, 1};
+     }},
+    {"GET CLOCK_DESCRIPTION of a port the clock lacks", kGet, 3, "00 01 00 02 00 01",
+     "error 65534 Failure getting value"},
+    {"GET FAULT_LOG", kGet, 1,
+     "00 01 00 14 00 06 | 00 01 | 00 0E | 00 00 00 00 00 05 00 00 00 07 | 07 | 00 00 00",
+     "00 01 00 04 00 06 00 00"},
+    {"COMMAND DISABLE_PORT", kCommand, 2, "00 01 00 02 20 0E", "00 01 00 02 20 0E"},
+    {"COMMAND INITIALIZE unknown key", kCommand, 1, "00 01 00 04 00 05 | 12 34",
+     "error 4 Unknown initialization key value"},
+    {"COMMAND SAVE_IN_NON_VOLATILE_STORAGE", kCommand, 1, "00 01 00 02 00 03",
+     "error 6 Non-volatile storage is currently unsupported"},
+    {"COMMAND FAULT_LOG_RESET", kCommand, 1, "00 01 00 02 00 07", "00 01 00 02 00 07"},
+    {"GET ENABLE_PORT", kGet, 1, "00 01 00 02 20 0D", "error 6 Unsupported actionField"},
+    {"COMMAND PRIORITY2", kCommand, 1, "00 01 00 04 20 06 | 21 | 00",
+     "error 6 Unsupported actionField"},
+    // The clock fails every set and command from here on.
+    {"SET PRIORITY2 failing", kSet, 1, "00 01 00 04 20 06 | 22 | 00",
+     "error 65534 Failure setting value",
+     [](Clock& c) { c.failures.setters = c.failures.commands = true; }},
+    {"SET TIMESCALE_PROPERTIES failing and unknown", kSet, 1, "00 01 00 04 20 13 | 00 | 11",
+     "error 4 Unknown timeSource value"},
+    {"SET USER_DESCRIPTION failing", kSet, 1, "00 01 00 04 00 02 | 01 78",
+     "error 65534 Failure setting value"},
+    {"COMMAND ENABLE_PORT failing", kCommand, 1, "00 01 00 02 20 0D",
+     "error 65534 Failure enabling port"},
+    {"COMMAND DISABLE_PORT failing", kCommand, 1, "00 01 00 02 20 0E",
+     "error 65534 Failure disabling port"},
+    {"COMMAND INITIALIZE failing", kCommand, 1, "00 01 00 04 00 05 | 00 00",
+     "error 65534 Node failed to initialize"},
+};
+
+TEST(ResponderTest, AnswersInOrderAgainstOneClock) {
+    Clock clock(2);
+    for (const Row& row : kRows) {
+        SCOPED_TRACE(row.name);
+        if (row.prepare != nullptr) {
+            row.prepare(clock);
+        }
+        // A request without its data field is the table's default object, as the client
+        // sends a GET.
+        const auto octets = qvtest::hexOctets(row.request);
+        auto request =
+            findManagementId(static_cast<std::uint16_t>(octets[4] << 8 | octets[5]))->create();
+        tStatus status;
+        if (octets.size() > 6) {
+            qvtest::Datagram datagram(row.request);
+            request->deserialize(datagram.unit(), status);
+        }
+        const auto answer = request->respond(row.action, clock, row.port, status);
+        ASSERT_TRUE(status.succeeded()) << status.code;
+        ASSERT_NE(answer, nullptr);
+        EXPECT_EQ(answerText(*answer), row.answer);
+    }
+    EXPECT_FALSE(clock.port(2).enabled);
+    EXPECT_EQ(clock.defaultDataSet.priority2, 0x21);
 }
 
-TEST_F(ResponderTest, EveryGetOfAFailingClockIsAGeneralError) {
+TEST(ResponderTest, EveryGetOfAFailingClockIsAGeneralError) {
+    Clock clock;
     clock.failures.getters = true;
     for (const tManagementIdEntry& row : managementIdTable()) {
-        auto tlv = row.create();
-        const std::string answer = refusal(ask(*tlv, kGet));
-        switch (row.managementId) {
-            case kNullManagement:
-            case kFaultLog:  // answered with an empty log without asking the clock
-                EXPECT_EQ(answer, "") << row.name;
-                break;
-            case kSaveInNonVolatileStorage:
-            case kResetNonVolatileStorage:
-            case kInitialize:
-            case kFaultLogReset:
-            case kEnablePort:
-            case kDisablePort:
-                EXPECT_EQ(answer, unsupported) << row.name;
-                break;
-            default:
-                EXPECT_EQ(answer, generalGet) << row.name;
-        }
-    }
-}
-
-TEST_F(ResponderTest, SingleValueSetsApplyOrRefuse) {
-    tStatus status;
-    tPriority2TLV priority2;
-    priority2.setValue(33, status);
-    EXPECT_EQ(refusal(ask(priority2, kSet)), "");
-    EXPECT_EQ(clock.defaultDataSet.priority2, 33);
-
-    tSlaveOnlyTLV slaveOnly;
-    slaveOnly.setValue(true, status);
-    ask(slaveOnly, kSet);
-    EXPECT_TRUE(clock.defaultDataSet.slaveOnly);
-
-    tLogSyncIntervalTLV sync;
-    sync.setValue(-2, status);
-    ask(sync, kSet, 2);
-    EXPECT_EQ(clock.port(2).logSyncInterval, -2);
-    EXPECT_EQ(clock.port(1).logSyncInterval, 0);
-    EXPECT_EQ(as<tLogSyncIntervalTLV>(ask(sync, kGet, 2)).getValue(), -2);
-
-    tClockAccuracyTLV accuracy;
-    accuracy.setValue(0x1F, status);
-    EXPECT_EQ(refusal(ask(accuracy, kSet)), "4 Unsupported clockAccuracy value");
-    EXPECT_EQ(clock.defaultDataSet.clockQuality.clockAccuracy, 0xFEU);
-    accuracy.setValue(0x31, status);
-    ask(accuracy, kSet);
-    EXPECT_EQ(clock.defaultDataSet.clockQuality.clockAccuracy, 0x31U);
-
-    tDelayMechanismTLV delay;
-    delay.setValue(3, status);
-    EXPECT_EQ(refusal(ask(delay, kSet)), "4 Unsupported delayMechanism value");
-    EXPECT_EQ(clock.port(1).delayMechanism, 1);
-    delay.setValue(0xFE, status);
-    ask(delay, kSet);
-    EXPECT_EQ(clock.port(1).delayMechanism, 0xFE);
-
-    clock.failures.setters = true;
-    EXPECT_EQ(refusal(ask(priority2, kSet)), generalSet);
-    EXPECT_EQ(refusal(ask(sync, kSet)), generalSet);
-    EXPECT_EQ(refusal(ask(priority2, kCommand)), unsupported);
-}
-
-TEST_F(ResponderTest, PropertySets) {
-    Datagram utcOctets("00 01 00 06 20 11 | FF FF | 05 | 00");  // -1, UTCV and LI61
-    tUTCPropertiesTLV utc;
-    tStatus status;
-    utc.deserialize(utcOctets.unit(), status);
-    ask(utc, kSet);
-    EXPECT_EQ(clock.timeProperties.currentUtcOffset, -1);
-    EXPECT_TRUE(clock.timeProperties.currentUtcOffsetValid);
-    EXPECT_FALSE(clock.timeProperties.leap59);
-    EXPECT_TRUE(clock.timeProperties.leap61);
-
-    Datagram traceOctets("00 01 00 04 20 12 | 10 | 00");  // time traceable only
-    tTraceabilityPropertiesTLV traceability;
-    traceability.deserialize(traceOctets.unit(), status);
-    ask(traceability, kSet);
-    EXPECT_TRUE(clock.timeProperties.timeTraceable);
-    EXPECT_FALSE(clock.timeProperties.frequencyTraceable);
-
-    // An unknown time source is refused, but ptpTimescale is applied all the same, and the
-    // refusal wins over a failing clock.
-    Datagram scaleOctets("00 01 00 04 20 13 | 00 | 11");
-    tTimescalePropertiesTLV timescale;
-    timescale.deserialize(scaleOctets.unit(), status);
-    EXPECT_EQ(refusal(ask(timescale, kSet)), "4 Unknown timeSource value");
-    EXPECT_FALSE(clock.timeProperties.ptpTimescale);
-    EXPECT_EQ(clock.timeProperties.timeSource, 0xA0);
-    clock.failures.setters = true;
-    EXPECT_EQ(refusal(ask(timescale, kSet)), "4 Unknown timeSource value");
-    EXPECT_EQ(refusal(ask(utc, kSet)), generalSet);
-}
-
-TEST_F(ResponderTest, TimeIsSetOnlyOnAGrandmaster) {
-    tStatus status;
-    tTimeTLV time;
-    time.setCurrentTime(tTimestamp(1000, 5), status);
-    ask(time, kSet);
-    EXPECT_EQ(clock.time, tTimestamp(1000, 5));
-    EXPECT_EQ(as<tTimeTLV>(ask(time, kGet)).getCurrentTime(), tTimestamp(1000, 5));
-
-    const std::uint8_t other[8] = {9, 9, 9, 9, 9, 9, 9, 9};
-    clock.parentDataSet.grandmasterIdentity = tClockIdentity(other);
-    time.setCurrentTime(tTimestamp(2000, 0), status);
-    EXPECT_EQ(refusal(ask(time, kSet)), "6 Cannot set time on non-grandmaster clock");
-    EXPECT_EQ(clock.time, tTimestamp(1000, 5));
-}
-
-TEST_F(ResponderTest, UserDescriptionSetAndGet) {
-    tStatus status;
-    tUserDescriptionTLV tlv;
-    tlv.setUserDescription(tPTPText("rack 4", status), status);
-    ask(tlv, kSet);
-    EXPECT_EQ(clock.userDescription.view(), "rack 4");
-    tUserDescriptionTLV empty;
-    const Answer answer = ask(empty, kGet);
-    EXPECT_EQ(as<tUserDescriptionTLV>(answer).getUserDescription().view(), "rack 4");
-    EXPECT_EQ(as<tUserDescriptionTLV>(answer).getLengthField(), 10);  // 2 + 7 + pad
-    clock.failures.setters = true;
-    EXPECT_EQ(refusal(ask(tlv, kSet)), generalSet);
-}
-
-TEST_F(ResponderTest, Commands) {
-    tDisablePortTLV disable;
-    EXPECT_EQ(refusal(ask(disable, kCommand, 2)), "");
-    EXPECT_FALSE(clock.port(2).enabled);
-    tEnablePortTLV enable;
-    ask(enable, kCommand, 2);
-    EXPECT_TRUE(clock.port(2).enabled);
-    EXPECT_EQ(refusal(ask(enable, kGet)), unsupported);
-
-    tInitializeTLV initialize;
-    ask(initialize, kCommand, 1);
-    EXPECT_EQ(clock.port(1).initializations, 1U);
-    tInitializeTLV unknownKey(0x1234);
-    EXPECT_EQ(refusal(ask(unknownKey, kCommand)), "4 Unknown initialization key value");
-    EXPECT_EQ(clock.port(1).initializations, 1U);
-
-    tSaveInNonVolatileStorageTLV save;
-    EXPECT_EQ(refusal(ask(save, kCommand)), "6 Non-volatile storage is currently unsupported");
-    tFaultLogResetTLV reset;
-    EXPECT_EQ(as<tFaultLogResetTLV>(ask(reset, kCommand)).getManagementId(), kFaultLogReset);
-
-    clock.failures.commands = true;
-    const std::string general = std::to_string(Error::kGeneralError);
-    EXPECT_EQ(refusal(ask(enable, kCommand)), general + " Failure enabling port");
-    EXPECT_EQ(refusal(ask(disable, kCommand)), general + " Failure disabling port");
-    EXPECT_EQ(refusal(ask(initialize, kCommand)), general + " Node failed to initialize");
-}
-
-TEST_F(ResponderTest, FaultLogAnswersEmpty) {
-    Datagram octets(
-        "00 01 00 14 00 06 | 00 01 | 00 0E | 00 00 00 00 00 05 00 00 00 07 | 07 |"
-        "00 00 00");
-    tFaultLogTLV log;
-    tStatus status;
-    log.deserialize(octets.unit(), status);
-    const Answer answer = ask(log, kGet);
-    EXPECT_EQ(as<tFaultLogTLV>(answer).getNumberOfFaultRecords(), 0);
-    EXPECT_EQ(as<tFaultLogTLV>(answer).getLengthField(), 4);
-}
-
-TEST_F(ResponderTest, AStatusInErrorGetsNoAnswer) {
-    tStatus failed;
-    failed.set(kStatusNoData, "x", "y", 1);
-    for (const tManagementIdEntry& row : managementIdTable()) {
-        auto tlv = row.create();
-        for (std::uint32_t action : {kGet, kSet, kCommand}) {
-            EXPECT_EQ(tlv->respond(action, clock, 1, failed), nullptr) << row.name;
+        SCOPED_TRACE(row.name);
+        tStatus status;
+        const auto answer = row.create()->respond(kGet, clock, 1, status);
+        ASSERT_NE(answer, nullptr);
+        const std::string text = answerText(*answer);
+        if (row.managementId == kNullManagement || row.managementId == kFaultLog) {
+            EXPECT_EQ(text.find("error"), std::string::npos);    // the clock is not asked
+        } else if (text != "error 6 Unsupported actionField") {  // commands
+            EXPECT_EQ(text, "error 65534 Failure getting value");
         }
     }
 }

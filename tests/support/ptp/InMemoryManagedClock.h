@@ -14,6 +14,8 @@ namespace qvtest {
 // -52005. Each kind of operation can be made to fail, to drive the GENERAL_ERROR answers.
 class InMemoryManagedClock : public nQVPTP000::iManagedClock {
   public:
+    using Manufacturer = std::array<std::uint8_t, 3>;
+    using Profile = std::array<std::uint8_t, 6>;
     struct DefaultDataSet {
         bool twoStepFlag = false;
         bool slaveOnly = false;
@@ -64,10 +66,10 @@ class InMemoryManagedClock : public nQVPTP000::iManagedClock {
         nQVPTP000::tPTPText physicalLayerProtocol;
         std::vector<std::uint8_t> physicalAddress;
         nQVPTP000::tPortAddress protocolAddress;
-        std::array<std::uint8_t, 3> manufacturerIdentity{};
+        Manufacturer manufacturerIdentity{};
         nQVPTP000::tPTPText productDescription;
         nQVPTP000::tPTPText revisionData;
-        std::array<std::uint8_t, 6> profileIdentity{};
+        Profile profileIdentity{};
         // Commands.
         bool enabled = true;
         unsigned initializations = 0;
@@ -96,85 +98,90 @@ class InMemoryManagedClock : public nQVPTP000::iManagedClock {
     // The port of that number; the test must know that it exists.
     Port& port(std::uint16_t number) { return ports.at(number - 1U); }
 
-    bool getTwoStepFlag(tStatus& status) override;
-    bool getSlaveOnly(tStatus& status) override;
-    void setSlaveOnly(bool slaveOnly, tStatus& status) override;
-    std::uint16_t getNumberPorts(tStatus& status) override;
-    std::uint8_t getPriority1(tStatus& status) override;
-    void setPriority1(std::uint8_t priority1, tStatus& status) override;
-    std::uint8_t getPriority2(tStatus& status) override;
-    void setPriority2(std::uint8_t priority2, tStatus& status) override;
-    std::uint8_t getDomainNumber(tStatus& status) override;
-    void setDomainNumber(std::uint8_t domainNumber, tStatus& status) override;
-    nQVPTP000::tClockQuality getClockQuality(tStatus& status) override;
-    void setClockAccuracy(std::uint8_t clockAccuracy, tStatus& status) override;
-    nQVPTP000::tClockIdentity getClockIdentity(tStatus& status) override;
+    // One row per member that the clock reads, or reads and writes.
+#define QV_GET(Type, Name, member)        \
+    Type get##Name(tStatus& s) override { \
+        return read(member, s);           \
+    }
+#define QV_GET_SET(Type, Name, member)            \
+    QV_GET(Type, Name, member)                    \
+    void set##Name(Type v, tStatus& s) override { \
+        write(member, v, s);                      \
+    }
+#define QV_PORT_GET(Type, Name, member)                    \
+    Type get##Name(std::uint16_t p, tStatus& s) override { \
+        return readPort(p, &Port::member, s);              \
+    }
+#define QV_PORT_GET_SET(Type, Name, member)                        \
+    QV_PORT_GET(Type, Name, member)                                \
+    void set##Name(std::uint16_t p, Type v, tStatus& s) override { \
+        writePort(p, &Port::member, v, s);                         \
+    }
+    QV_GET(bool, TwoStepFlag, defaultDataSet.twoStepFlag)
+    QV_GET_SET(bool, SlaveOnly, defaultDataSet.slaveOnly)
+    QV_GET_SET(std::uint8_t, Priority1, defaultDataSet.priority1)
+    QV_GET_SET(std::uint8_t, Priority2, defaultDataSet.priority2)
+    QV_GET_SET(std::uint8_t, DomainNumber, defaultDataSet.domainNumber)
+    QV_GET(nQVPTP000::tClockQuality, ClockQuality, defaultDataSet.clockQuality)
+    QV_GET(nQVPTP000::tClockIdentity, ClockIdentity, defaultDataSet.clockIdentity)
+    QV_GET(std::uint16_t, StepsRemoved, currentDataSet.stepsRemoved)
+    QV_GET(nQVPTP000::tTimeInterval, OffsetFromMaster, currentDataSet.offsetFromMaster)
+    QV_GET(nQVPTP000::tTimeInterval, MeanPathDelay, currentDataSet.meanPathDelay)
+    QV_GET(nQVPTP000::tPortIdentity, ParentPortIdentity, parentDataSet.parentPortIdentity)
+    QV_GET(bool, ParentStats, parentDataSet.parentStats)
+    QV_GET(std::uint16_t, ObservedParentOffsetScaledLogVariance,
+           parentDataSet.observedParentOffsetScaledLogVariance)
+    QV_GET(std::int32_t, ObservedParentClockPhaseChangeRate,
+           parentDataSet.observedParentClockPhaseChangeRate)
+    QV_GET(std::uint8_t, GrandmasterPriority1, parentDataSet.grandmasterPriority1)
+    QV_GET(nQVPTP000::tClockIdentity, GrandmasterIdentity, parentDataSet.grandmasterIdentity)
+    QV_GET(std::uint8_t, GrandmasterPriority2, parentDataSet.grandmasterPriority2)
+    QV_GET(nQVPTP000::tClockQuality, GrandmasterClockQuality, parentDataSet.grandmasterClockQuality)
+    QV_GET_SET(std::int16_t, CurrentUtcOffset, timeProperties.currentUtcOffset)
+    QV_GET_SET(bool, CurrentUtcOffsetValid, timeProperties.currentUtcOffsetValid)
+    QV_GET_SET(bool, Leap59, timeProperties.leap59)
+    QV_GET_SET(bool, Leap61, timeProperties.leap61)
+    QV_GET_SET(bool, TimeTraceable, timeProperties.timeTraceable)
+    QV_GET_SET(bool, FrequencyTraceable, timeProperties.frequencyTraceable)
+    QV_GET_SET(bool, PtpTimescale, timeProperties.ptpTimescale)
+    QV_GET_SET(std::uint8_t, TimeSource, timeProperties.timeSource)
+    QV_GET(nQVPTP000::tPTPText, UserDescription, userDescription)
+    QV_GET(nQVPTP000::tTimestamp, Time, time)
+    QV_PORT_GET(nQVPTP000::tPortIdentity, PortIdentity, portIdentity)
+    QV_PORT_GET(std::uint8_t, PortState, portState)
+    QV_PORT_GET(std::int8_t, LogMinDelayReqInterval, logMinDelayReqInterval)
+    QV_PORT_GET(nQVPTP000::tTimeInterval, PeerMeanPathDelay, peerMeanPathDelay)
+    QV_PORT_GET_SET(std::int8_t, LogAnnounceInterval, logAnnounceInterval)
+    QV_PORT_GET_SET(std::uint8_t, AnnounceReceiptTimeout, announceReceiptTimeout)
+    QV_PORT_GET_SET(std::int8_t, LogSyncInterval, logSyncInterval)
+    QV_PORT_GET_SET(std::uint8_t, DelayMechanism, delayMechanism)
+    QV_PORT_GET_SET(std::int8_t, LogMinPdelayReqInterval, logMinPdelayReqInterval)
+    QV_PORT_GET_SET(std::uint8_t, VersionNumber, versionNumber)
+    QV_PORT_GET(std::uint16_t, ClockType, clockType)
+    QV_PORT_GET(nQVPTP000::tPTPText, PhysicalLayerProtocol, physicalLayerProtocol)
+    QV_PORT_GET(nQVPTP000::tPortAddress, ProtocolAddress, protocolAddress)
+    QV_PORT_GET(Manufacturer, ManufacturerIdentity, manufacturerIdentity)
+    QV_PORT_GET(nQVPTP000::tPTPText, ProductDescription, productDescription)
+    QV_PORT_GET(nQVPTP000::tPTPText, RevisionData, revisionData)
+    QV_PORT_GET(Profile, ProfileIdentity, profileIdentity)
+#undef QV_GET
+#undef QV_GET_SET
+#undef QV_PORT_GET
+#undef QV_PORT_GET_SET
 
-    std::uint16_t getStepsRemoved(tStatus& status) override;
-    nQVPTP000::tTimeInterval getOffsetFromMaster(tStatus& status) override;
-    nQVPTP000::tTimeInterval getMeanPathDelay(tStatus& status) override;
-
-    nQVPTP000::tPortIdentity getParentPortIdentity(tStatus& status) override;
-    bool getParentStats(tStatus& status) override;
-    std::uint16_t getObservedParentOffsetScaledLogVariance(tStatus& status) override;
-    std::int32_t getObservedParentClockPhaseChangeRate(tStatus& status) override;
-    std::uint8_t getGrandmasterPriority1(tStatus& status) override;
-    nQVPTP000::tClockIdentity getGrandmasterIdentity(tStatus& status) override;
-    std::uint8_t getGrandmasterPriority2(tStatus& status) override;
-    nQVPTP000::tClockQuality getGrandmasterClockQuality(tStatus& status) override;
-
-    std::int16_t getCurrentUtcOffset(tStatus& status) override;
-    void setCurrentUtcOffset(std::int16_t currentUtcOffset, tStatus& status) override;
-    bool getCurrentUtcOffsetValid(tStatus& status) override;
-    void setCurrentUtcOffsetValid(bool valid, tStatus& status) override;
-    bool getLeap59(tStatus& status) override;
-    void setLeap59(bool leap59, tStatus& status) override;
-    bool getLeap61(tStatus& status) override;
-    void setLeap61(bool leap61, tStatus& status) override;
-    bool getTimeTraceable(tStatus& status) override;
-    void setTimeTraceable(bool timeTraceable, tStatus& status) override;
-    bool getFrequencyTraceable(tStatus& status) override;
-    void setFrequencyTraceable(bool frequencyTraceable, tStatus& status) override;
-    bool getPtpTimescale(tStatus& status) override;
-    void setPtpTimescale(bool ptpTimescale, tStatus& status) override;
-    std::uint8_t getTimeSource(tStatus& status) override;
-    void setTimeSource(std::uint8_t timeSource, tStatus& status) override;
-
-    nQVPTP000::tPortIdentity getPortIdentity(std::uint16_t port, tStatus& status) override;
-    std::uint8_t getPortState(std::uint16_t port, tStatus& status) override;
-    std::int8_t getLogMinDelayReqInterval(std::uint16_t port, tStatus& status) override;
-    nQVPTP000::tTimeInterval getPeerMeanPathDelay(std::uint16_t port, tStatus& status) override;
-    std::int8_t getLogAnnounceInterval(std::uint16_t port, tStatus& status) override;
-    void setLogAnnounceInterval(std::uint16_t port, std::int8_t value, tStatus& status) override;
-    std::uint8_t getAnnounceReceiptTimeout(std::uint16_t port, tStatus& status) override;
-    void setAnnounceReceiptTimeout(std::uint16_t port, std::uint8_t value,
-                                   tStatus& status) override;
-    std::int8_t getLogSyncInterval(std::uint16_t port, tStatus& status) override;
-    void setLogSyncInterval(std::uint16_t port, std::int8_t value, tStatus& status) override;
-    std::uint8_t getDelayMechanism(std::uint16_t port, tStatus& status) override;
-    void setDelayMechanism(std::uint16_t port, std::uint8_t value, tStatus& status) override;
-    std::int8_t getLogMinPdelayReqInterval(std::uint16_t port, tStatus& status) override;
-    void setLogMinPdelayReqInterval(std::uint16_t port, std::int8_t value,
-                                    tStatus& status) override;
-    std::uint8_t getVersionNumber(std::uint16_t port, tStatus& status) override;
-    void setVersionNumber(std::uint16_t port, std::uint8_t value, tStatus& status) override;
-
-    std::uint16_t getClockType(std::uint16_t port, tStatus& status) override;
-    nQVPTP000::tPTPText getPhysicalLayerProtocol(std::uint16_t port, tStatus& status) override;
+    std::uint16_t getNumberPorts(tStatus& s) override {
+        return read(static_cast<std::uint16_t>(ports.size()), s);
+    }
+    void setClockAccuracy(std::uint8_t a, tStatus& s) override {
+        write(defaultDataSet.clockQuality.clockAccuracy, std::uint32_t{a}, s);
+    }
     std::span<const std::uint8_t> getPhysicalAddress(std::uint16_t port, tStatus& status) override;
-    nQVPTP000::tPortAddress getProtocolAddress(std::uint16_t port, tStatus& status) override;
-    std::array<std::uint8_t, 3> getManufacturerIdentity(std::uint16_t port,
-                                                        tStatus& status) override;
-    nQVPTP000::tPTPText getProductDescription(std::uint16_t port, tStatus& status) override;
-    nQVPTP000::tPTPText getRevisionData(std::uint16_t port, tStatus& status) override;
-    std::array<std::uint8_t, 6> getProfileIdentity(std::uint16_t port, tStatus& status) override;
-
-    nQVPTP000::tPTPText getUserDescription(tStatus& status) override;
-    void setUserDescription(const nQVPTP000::tPTPText& text, tStatus& status) override;
-
-    nQVPTP000::tTimestamp getTime(tStatus& status) override;
-    void setTime(const nQVPTP000::tTimestamp& newTime, tStatus& status) override;
-
+    void setUserDescription(const nQVPTP000::tPTPText& t, tStatus& s) override {
+        write(userDescription, t, s);
+    }
+    void setTime(const nQVPTP000::tTimestamp& t, tStatus& s) override {
+        write(time, t, s);
+    }
     void enablePort(std::uint16_t port, tStatus& status) override;
     void disablePort(std::uint16_t port, tStatus& status) override;
     void initialize(std::uint16_t port, tStatus& status) override;

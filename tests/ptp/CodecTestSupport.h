@@ -1,11 +1,14 @@
-#ifndef QV_TESTS_PTP_PDUTESTSUPPORT_H
-#define QV_TESTS_PTP_PDUTESTSUPPORT_H
+#ifndef QV_TESTS_PTP_CODECTESTSUPPORT_H
+#define QV_TESTS_PTP_CODECTESTSUPPORT_H
 
+#include <memory>
 #include <string>
+#include <string_view>
 #include <vector>
 
 #include "platform/tTrace.h"
 #include "ptp/iPTPSerializable.h"
+#include "ptp/tPTPMessageFactory.h"
 #include "ptp/tProtocolDataUnit.h"
 #include "tests/support/Hex.h"
 #include "tests/support/TraceCapture.h"
@@ -41,6 +44,13 @@ class Datagram {
     tStatus status_;
     nQVPTP000::tProtocolDataUnit unit_;
 };
+
+// What the message factory makes of a datagram given as hex text.
+inline std::unique_ptr<nQVPTP000::tPTPMessage> decodeMessage(std::string_view hexText,
+                                                             tStatus& status) {
+    Datagram datagram(hexText);
+    return nQVPTP000::tPTPMessageFactory::createMessage(datagram.unit(), status);
+}
 
 // What an object's trace appends, without any header.
 inline std::string traceText(const nQVTARN000::iTraceable& object) {

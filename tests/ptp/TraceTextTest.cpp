@@ -1,0 +1,118 @@
+#include <gtest/gtest.h>
+
+#include "ptp/tMessageHeader.h"
+#include "ptp/tTLVFactory.h"
+#include "tests/ptp/CodecTestSupport.h"
+
+// The trace texts of the codec's objects, from the octets they were decoded from.
+
+using namespace nQVPTP000;
+
+namespace {
+
+TEST(TraceTextTest, HeaderDump) {
+    tMessageHeader header;
+    tStatus status;
+    header.setFlag(tMessageHeader::tFlag::leap59, true, status);
+    EXPECT_EQ(qvtest::traceText(header),
+              "--- Begin Message Header ---\ntransportSpecific: 0\nmessageType: 0xb\n"
+              "versionPTP: 2\nmessageLength: 0\ndomainNumber: 0\nalternateMasterFlag: FALSE\n"
+              "twoStepFlag: FALSE\nunicastFlag: FALSE\nprofileSpecific1: FALSE\n"
+              "profileSpecific2: FALSE\nSECURE: FALSE\nleap61: FALSE\nleap59: TRUE\n"
+              "currentUTCOffsetValid: FALSE\nptpTimescale: FALSE\ntimeTraceable: FALSE\n"
+              "frequencyTraceable: FALSE\ncorrectionField: 0\n"
+              "sourcePortIdentity: clockIdentity: ffffffffffffffff portNumber: 65535\n"
+              "sequenceId: 0\ncontrolField: 0\nlogMessageInterval: 127\n"
+              "--- End Message Header ---\n");
+}
+
+// What follows the header dump in a message's trace.
+TEST(TraceTextTest, MessageBodies) {
+    // Version 2, domain 0, no flags, source 001b21.fffe.010203-1, sequence 0x0102.
+    auto header = [](const char* typeVersionLength) {
+        return std::string(typeVersionLength) +
+               " | 00 | 00 | 00 00 | 00 00 00 00 00 00 00 00 | 00 00 00 00 |"
+               "00 1B 21 FF FE 01 02 03 | 00 01 | 01 02 | 05 | 00 |";
+    };
+    const std::pair<std::string, const char*> rows[] = {
+        // Announce: currentUtcOffset -1, shown as the design's unsigned 32 bits
+        {header("0B 02 00 40") +
+             "00 00 00 00 00 00 00 00 00 00 | FF FF | 00 | 80 | 06 21 4E 5D | 80 |"
+             "00 1B 21 FF FE 01 02 03 | 00 00 | 20",
+         "originTimestamp: secondsField: 0 nanosecondsField: 0\ncurrentUTCOffset: 4294967295\n"
+         "timeSource: 32\nstepsRemoved: 0\ngrandmasterIdentity: 001b21fffe010203\n"
+         "grandmasterClockQuality: clockClass: 6 clockAccuracy: 0x21 offsetScaledLogVariance: "
+         "0x4e5d\ngrandmasterPriority1: 128\ngrandmasterPriority2: 128\n"
+         "--- End Announce Message ---\n"},
+        // GET NULL_MANAGEMENT and an error status TLV, to all ports of all clocks
+        {header("0D 02 00 40") +
+             "FF FF FF FF FF FF FF FF FF FF | 00 | 00 | 00 | 00 | 00 01 00 02 00 00 |"
+             "00 02 00 08 00 06 20 05 00 00 00 00",
+         "targetPortIdentity: clockIdentity: ffffffffffffffff portNumber: 65535\n"
+         "startingBoundaryHops: 0 boundaryHops: 0 actionField: 0 "
+         "--- Begin TLV 0 ---tlvType 1 lengthField 2 managementId: 0000 --- End TLV 0 ---"
+         "--- Begin TLV 1 ---tlvType 2 lengthField 8 --- End TLV 1 ---"
+         "--- End Management Message ---\n"},
+    };
+    for (const auto& [octets, body] : rows) {
+        tStatus status;
+        const auto message = qvtest::decodeMessage(octets, status);
+        ASSERT_NE(message, nullptr) << status.code;
+        const std::string text = qvtest::traceText(*message);
+        const std::string headerEnd = "--- End Message Header ---\n";
+        EXPECT_EQ(text.substr(text.find(headerEnd) + headerEnd.size()), body);
+    }
+}
+
+TEST(TraceTextTest, TLVs) {
+    const std::pair<const char*, const char*> rows[] = {
+        {"00 01 00 04 20 08 | 01 | 00",
+         "tlvType 1 lengthField 4 managementId: 0x2008 slaveOnly: true(1)\n"},
+        {"00 01 00 0C 20 0F | 00 01 00 00 00 02 | 00 00 00 03",
+         "tlvType 1 lengthField 12 managementId: 0x200f currentTime: "
+         "secondsField: 4294967298 nanosecondsField: 3\n"},
+        {"00 01 00 14 20 01 | 00 02 | FF FF FF FF FF FF 00 00 | 00 00 00 00 00 0A 00 00",
+         "tlvType 1 lengthField 20 managementId: 0x2001 stepsRemoved2 "
+         "offsetFromMasterscaledNanoseconds: -65536 meanPathDelayscaledNanoseconds: 655360\n"},
+        {"00 01 00 22 20 02 | FF FF FF FF FF FF FF FF FF FF | 00 | 00 | FF FF | 7F FF FF FF | 00 |"
+         "BB FE FF FF | 00 | 00 00 00 00 00 00 00 00",
+         "tlvType 1 lengthField 34 managementId: 0x2002 parent port identityclockIdentity: "
+         "ffffffffffffffff portNumber: 65535\nPSfalse(0)observedParentOffsetScaledLogVariance"
+         "65535observedParentClockPhaseChangeRate2147483647grandmasterPriority10"
+         "grandmasterIdentity0000000000000000grandmasterPriority20grandmasterClockQuality"
+         "clockClass: 187 clockAccuracy: 0xfe offsetScaledLogVariance: 0xffff\n"},
+        {"00 03 | 00 09 | 00 21 D6 | FF FF FF | 61 62 63",
+         "LXI Consortium NOT_DEFINED TLV data field: abc\n"},
+    };
+    for (const auto& [octets, text] : rows) {
+        qvtest::Datagram datagram(octets);
+        tStatus status;
+        const auto tlv = tTLVFactory::createTLV(datagram.unit(), status);
+        ASSERT_NE(tlv, nullptr) << octets;
+        EXPECT_EQ(qvtest::traceText(*tlv), text);
+    }
+}
+
+// Organization extensions other than LXI's are traced as they are dropped.
+TEST(TraceTextTest, RejectedOrganizationExtensions) {
+    const std::pair<const char*, std::string> rows[] = {
+        {"00 03 | 00 08 | 00 21 D6 | 00 00 01 | AA BB",
+         "Unsupported organizationSubType 000001 for" + std::string(28, ' ') +
+             "organization 0021d6\n"},
+        {"00 03 | 00 06 | 02 A5 3C | 12 34 56", "Unsupported organizationSubType 123456 for" +
+                                                    std::string(22, ' ') + "organization 02a53c\n"},
+        {"00 03 | 00 06 | 00 80 C2 | 00 00 01", "Unsupported organizationId 0080c2\n"},
+    };
+    for (const auto& [octets, expected] : rows) {
+        qvtest::DebugOutputCapture capture;
+        qvtest::Datagram datagram(octets);
+        tStatus status;
+        EXPECT_EQ(tTLVFactory::createTLV(datagram.unit(), status), nullptr);
+        EXPECT_EQ(status.code, kStatusUnsupported);
+        const std::string traced = capture.text();
+        EXPECT_EQ(traced.rfind("[qvptp3u--", 0), 0U) << traced;
+        EXPECT_EQ(traced.substr(traced.find("] ") + 2), expected + "\n");  // and the line end
+    }
+}
+
+}  // namespace
