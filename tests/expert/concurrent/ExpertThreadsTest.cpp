@@ -9,19 +9,12 @@
 
 namespace {
 
-struct CountingCollector final : IkxSysItemCollector {
-    HRESULT KXSYS_CALL QueryInterface(const IID&, void**) override { return E_NOINTERFACE; }
-    ULONG KXSYS_CALL AddRef() override { return 2; }
-    ULONG KXSYS_CALL Release() override { return 1; }
-    HRESULT KXSYS_CALL ReservedCollector1() override { return E_NOTIMPL; }
-    HRESULT KXSYS_CALL ReservedCollector2() override { return E_NOTIMPL; }
-    HRESULT KXSYS_CALL AddItem(IkxSysPropertyBag*) override { return S_OK; }
-};
+using qvtest::ExpertFixture;
 
-TEST_F(qvtest::ExpertFixture, ThreadsShareOneExpert) {
+TEST_F(ExpertFixture, ThreadsShareOneExpert) {
     std::atomic<int> failures{0};
     auto work = [&] {
-        CountingCollector collector;
+        qvtest::NameCollector collector;
         const kxSysAttributeTagID tags[] = {kxQvPriority1, kxQvPortState, kxQvUserDescription};
         for (int i = 0; i < 10; ++i) {
             CQVComPtr<IkxSysEnumStringList> names;

@@ -15,6 +15,7 @@
 #include <vector>
 
 #include "qv1588/corbel.h"
+#include "tests/expert/clocks/BagText.h"
 #include "tests/expert/network/LoadedExpert.h"
 #include "tests/support/NetworkNamespaceEntry.h"
 #include "tests/support/NetworkTestGuard.h"

@@ -2,7 +2,6 @@
 
 #include <dlfcn.h>
 
-#include <cctype>
 #include <cstdio>
 #include <sstream>
 
@@ -52,56 +51,6 @@ std::u16string itemNameOf(const TestClock& clock) {
     std::snprintf(text, sizeof text, "%.2X-%.2X-%.2X-%.2X-%.2X-%.2X-%.2X-%.2X:%u", id[0], id[1],
                   id[2], id[3], id[4], id[5], id[6], id[7], clock.portNumber);
     return std::u16string(text, text + std::char_traits<char>::length(text));
-}
-
-std::vector<kxSysAttributeTagID> readableTags() {
-    std::vector<kxSysAttributeTagID> tags;
-    for (const kxQvAttribute& row : kxQvAttributes) {
-        if (row.requestable) {
-            tags.push_back(row.tag);
-        }
-    }
-    return tags;
-}
-
-std::string textOf(IkxSysPropertyBag& bag, kxSysAttributeTagID tag) {
-    ULONG type = 0;
-    if (bag.GetTagType(tag, &type) != S_OK) {
-        return "(none)";
-    }
-    BOOL flag = 0;
-    LONG signedValue = 0;
-    ULONG unsignedValue = 0;
-    double real = 0;
-    BSTR text = nullptr;
-    switch (type) {
-        case kxSysPropertyTypeBool:
-            bag.GetBool(tag, &flag);
-            return std::to_string(flag);
-        case kxSysPropertyTypeLong:
-            bag.GetLong(tag, &signedValue);
-            return std::to_string(signedValue);
-        case kxSysPropertyTypeULong:
-            bag.GetULong(tag, &unsignedValue);
-            return std::to_string(unsignedValue);
-        case kxSysPropertyTypeDouble: {
-            bag.GetDouble(tag, &real);
-            char number[64];
-            std::snprintf(number, sizeof number, "%.1f", real);
-            return number;
-        }
-        case kxSysPropertyTypeString: {
-            bag.GetString(tag, &text);
-            std::string narrow;
-            for (const OLECHAR* unit = text; unit != nullptr && *unit != 0; ++unit) {
-                narrow.push_back(static_cast<char>(*unit));
-            }
-            SysFreeString(text);
-            return narrow;
-        }
-        default:
-            return "(type " + std::to_string(type) + ")";
-    }
 }
 
 }  // namespace qvtest

@@ -7,6 +7,7 @@
 #include <vector>
 
 #include "qv1588/corbel.h"
+#include "tests/expert/clocks/BagText.h"
 #include "tests/support/TestNetwork.h"
 
 namespace qvtest {
@@ -35,12 +36,6 @@ std::map<std::string, std::string> pmcValues(const TestNetwork& network, const T
 
 // The item name of a test clock's port, e.g. 02-00-00-FF-FE-00-00-01:1.
 std::u16string itemNameOf(const TestClock& clock);
-
-// Every tag that GetItemProperties reads.
-std::vector<kxSysAttributeTagID> readableTags();
-
-// A bag value as text, as pmc would print it where it prints the same field.
-std::string textOf(IkxSysPropertyBag& bag, kxSysAttributeTagID tag);
 
 }  // namespace qvtest
 
