@@ -11,7 +11,9 @@
 #include <functional>
 #include <sstream>
 #include <string>
+#include <string_view>
 #include <thread>
+#include <tuple>
 #include <vector>
 
 #include "qv1588/corbel.h"
@@ -25,7 +27,6 @@ namespace {
 
 using namespace qvtest;
 using namespace std::chrono_literals;
-using tValues = std::map<std::string, std::string>;
 
 // Holds one reference and releases it.
 template <class I>
@@ -102,103 +103,65 @@ struct HostedExpert {
     ASSERT_NE((hosted).library.create(), nullptr) << (hosted).library.failure(); \
     ASSERT_EQ((hosted).initialized, S_OK)
 
-// pmc's text turned into the text of our value.
-using tExpected = std::function<std::string(const tValues&, const std::string&)>;
-
-std::string number(const tValues& v, const std::string& name) {
-    const auto found = v.find(name);
-    return found == v.end() ? "(pmc: none)" : std::to_string(std::stol(found->second, nullptr, 0));
-}
-std::string real(const tValues& v, const std::string& name) {
-    return number(v, name) + ".0";
-}
-std::string asIs(const tValues& v, const std::string& name) {
-    const auto found = v.find(name);
-    return found == v.end() ? "(pmc: none)" : found->second;
-}
-// 020000.fffe.000001-1 -> 02-00-00-FF-FE-00-00-01:1; colons -> dashes for octet lists.
-std::string identity(const tValues& v, const std::string& name) {
-    std::string hex;
-    std::string port;
-    const std::string text = asIs(v, name);
-    for (std::size_t i = 0; i < text.size(); ++i) {
-        if (text[i] == '-') {
-            port = ":" + text.substr(i + 1);
-            break;
-        }
-        if (std::isxdigit(static_cast<unsigned char>(text[i]))) {
-            hex.push_back(static_cast<char>(std::toupper(text[i])));
-        }
+// One form for pmc's text and ours: the last word, pmc's port-state names and 0x numbers
+// as decimal, no ".0" ending, lower case, no separators between octets or fields.
+std::string canonical(const std::string& text) {
+    static const std::vector<std::string> kStates = {"INITIALIZING", "FAULTY",       "DISABLED",
+                                                     "LISTENING",    "PRE_MASTER",   "MASTER",
+                                                     "PASSIVE",      "UNCALIBRATED", "SLAVE"};
+    std::string word = text.substr(text.find_last_of(' ') + 1);
+    const auto state = std::find(kStates.begin(), kStates.end(), word);
+    if (state != kStates.end()) {
+        return std::to_string(state - kStates.begin() + 1);
+    }
+    if (word.rfind("0x", 0) == 0) {
+        return std::to_string(std::stoul(word, nullptr, 16));
+    }
+    if (word.size() > 2 && word.compare(word.size() - 2, 2, ".0") == 0) {
+        word.resize(word.size() - 2);
     }
     std::string result;
-    for (std::size_t i = 0; i + 1 < hex.size(); i += 2) {
-        result += (i == 0 ? "" : "-") + hex.substr(i, 2);
-    }
-    return result + port;
-}
-std::string octets(const tValues& v, const std::string& name, char separator) {
-    std::string text = asIs(v, name);
-    for (char& c : text) {
-        c = c == ':' ? separator : static_cast<char>(std::toupper(c));
-    }
-    return text;
-}
-std::string state(const tValues& v, const std::string& name) {
-    static const char* const kStates[] = {"INITIALIZING", "FAULTY",       "DISABLED",
-                                          "LISTENING",    "PRE_MASTER",   "MASTER",
-                                          "PASSIVE",      "UNCALIBRATED", "SLAVE"};
-    for (int i = 0; i < 9; ++i) {
-        if (asIs(v, name) == kStates[i]) {
-            return std::to_string(i + 1);
+    for (std::size_t i = 0; i < word.size(); ++i) {
+        if (std::string_view(".:-").find(word[i]) == std::string_view::npos ||
+            (i == 0 && word[i] == '-')) {
+            result.push_back(static_cast<char>(std::tolower(static_cast<unsigned char>(word[i]))));
         }
     }
-    return "(pmc: " + asIs(v, name) + ")";
+    return result;
 }
 
-struct Comparison {
-    kxSysAttributeTagID tag;
-    const char* managementId;
-    const char* name;
-    tExpected expected;
-};
-
-const Comparison kComparisons[] = {
-    {kxQvDomainNumber, "DEFAULT_DATA_SET", "domainNumber", number},
-    {kxQvPriority1, "DEFAULT_DATA_SET", "priority1", number},
-    {kxQvPriority2, "DEFAULT_DATA_SET", "priority2", number},
-    {kxQvSlaveOnly, "DEFAULT_DATA_SET", "slaveOnly", number},
-    {kxQvTwoStepFlag, "DEFAULT_DATA_SET", "twoStepFlag", number},
-    {kxQvClockClass, "DEFAULT_DATA_SET", "clockClass", number},
-    {kxQvClockAccuracy, "DEFAULT_DATA_SET", "clockAccuracy", number},
-    {kxQvPortState, "PORT_DATA_SET", "portState", state},
-    {kxQvAnnounceReceiptTimeout, "PORT_DATA_SET", "announceReceiptTimeout", real},
-    {kxQvLogAnnounceInterval, "PORT_DATA_SET", "logAnnounceInterval", number},
-    {kxQvLogSyncInterval, "PORT_DATA_SET", "logSyncInterval", number},
-    {kxQvLogMinPdelayReqInterval, "PORT_DATA_SET", "logMinPdelayReqInterval", number},
-    {kxQvDelayMechanism, "PORT_DATA_SET", "delayMechanism", number},
-    {kxQvStepsRemoved, "CURRENT_DATA_SET", "stepsRemoved", number},
-    {kxQvOffsetFromMaster, "CURRENT_DATA_SET", "offsetFromMaster", asIs},
-    {kxQvMeanPathDelay, "CURRENT_DATA_SET", "meanPathDelay", asIs},
-    {kxQvTimeSource, "TIME_PROPERTIES_DATA_SET", "timeSource", number},
-    {kxQvPtpTimescale, "TIME_PROPERTIES_DATA_SET", "ptpTimescale", number},
-    {kxQvTimeTraceable, "TIME_PROPERTIES_DATA_SET", "timeTraceable", number},
-    {kxQvFrequencyTraceable, "TIME_PROPERTIES_DATA_SET", "frequencyTraceable", number},
-    {kxQvParentPortIdentity, "PARENT_DATA_SET", "parentPortIdentity", identity},
-    {kxQvGrandmasterIdentity, "PARENT_DATA_SET", "grandmasterIdentity", identity},
-    {kxQvGrandmasterPriority1, "PARENT_DATA_SET", "grandmasterPriority1", number},
-    {kxQvGrandmasterPriority2, "PARENT_DATA_SET", "grandmasterPriority2", number},
-    {kxQvGrandmasterClockClass, "PARENT_DATA_SET", "gm.ClockClass", number},
-    {kxQvGrandmasterClockAccuracy, "PARENT_DATA_SET", "gm.ClockAccuracy", number},
-    {kxSysHardwareAddress, "CLOCK_DESCRIPTION", "physicalAddress",
-     [](const tValues& v, const std::string& n) { return octets(v, n, ':'); }},
-    {kxQvProfileIdentity, "CLOCK_DESCRIPTION", "profileId",
-     [](const tValues& v, const std::string& n) { return octets(v, n, '-'); }},
-    {kxQvUserDescription, "CLOCK_DESCRIPTION", "userDescription", asIs},
-    {kxSysNetworkAddress, "CLOCK_DESCRIPTION", "protocolAddress",
-     [](const tValues& v, const std::string& n) {
-         const std::string text = asIs(v, n);
-         return text.substr(text.find(' ') + 1);
-     }},
+// Our tag and the management id and name under which pmc prints the same member.
+const std::tuple<kxSysAttributeTagID, const char*, const char*> kComparisons[] = {
+    {kxQvDomainNumber, "DEFAULT_DATA_SET", "domainNumber"},
+    {kxQvPriority1, "DEFAULT_DATA_SET", "priority1"},
+    {kxQvPriority2, "DEFAULT_DATA_SET", "priority2"},
+    {kxQvSlaveOnly, "DEFAULT_DATA_SET", "slaveOnly"},
+    {kxQvTwoStepFlag, "DEFAULT_DATA_SET", "twoStepFlag"},
+    {kxQvClockClass, "DEFAULT_DATA_SET", "clockClass"},
+    {kxQvClockAccuracy, "DEFAULT_DATA_SET", "clockAccuracy"},
+    {kxQvPortState, "PORT_DATA_SET", "portState"},
+    {kxQvAnnounceReceiptTimeout, "PORT_DATA_SET", "announceReceiptTimeout"},
+    {kxQvLogAnnounceInterval, "PORT_DATA_SET", "logAnnounceInterval"},
+    {kxQvLogSyncInterval, "PORT_DATA_SET", "logSyncInterval"},
+    {kxQvLogMinPdelayReqInterval, "PORT_DATA_SET", "logMinPdelayReqInterval"},
+    {kxQvDelayMechanism, "PORT_DATA_SET", "delayMechanism"},
+    {kxQvStepsRemoved, "CURRENT_DATA_SET", "stepsRemoved"},
+    {kxQvOffsetFromMaster, "CURRENT_DATA_SET", "offsetFromMaster"},
+    {kxQvMeanPathDelay, "CURRENT_DATA_SET", "meanPathDelay"},
+    {kxQvTimeSource, "TIME_PROPERTIES_DATA_SET", "timeSource"},
+    {kxQvPtpTimescale, "TIME_PROPERTIES_DATA_SET", "ptpTimescale"},
+    {kxQvTimeTraceable, "TIME_PROPERTIES_DATA_SET", "timeTraceable"},
+    {kxQvFrequencyTraceable, "TIME_PROPERTIES_DATA_SET", "frequencyTraceable"},
+    {kxQvParentPortIdentity, "PARENT_DATA_SET", "parentPortIdentity"},
+    {kxQvGrandmasterIdentity, "PARENT_DATA_SET", "grandmasterIdentity"},
+    {kxQvGrandmasterPriority1, "PARENT_DATA_SET", "grandmasterPriority1"},
+    {kxQvGrandmasterPriority2, "PARENT_DATA_SET", "grandmasterPriority2"},
+    {kxQvGrandmasterClockClass, "PARENT_DATA_SET", "gm.ClockClass"},
+    {kxQvGrandmasterClockAccuracy, "PARENT_DATA_SET", "gm.ClockAccuracy"},
+    {kxSysHardwareAddress, "CLOCK_DESCRIPTION", "physicalAddress"},
+    {kxSysNetworkAddress, "CLOCK_DESCRIPTION", "protocolAddress"},
+    {kxQvProfileIdentity, "CLOCK_DESCRIPTION", "profileId"},
+    {kxQvUserDescription, "CLOCK_DESCRIPTION", "userDescription"},
 };
 
 TEST(ExpertOnRealClocks, FindsExactlyTheClocksAndReadsWhatPmcReads) {
@@ -217,26 +180,32 @@ TEST(ExpertOnRealClocks, FindsExactlyTheClocksAndReadsWhatPmcReads) {
 
     for (const TestClock& clock : network.clocks()) {
         SCOPED_TRACE(clock.impl + " in domain " + std::to_string(clock.domain));
-        Held<IkxSysPropertyBag> bag;
-        const auto started = std::chrono::steady_clock::now();
-        const HRESULT result = hosted.read(clock, readableTags(), bag);
-        std::printf("%s: every readable tag: 0x%08X in %lld ms\n", clock.impl.c_str(),
-                    static_cast<unsigned>(result),
-                    static_cast<long long>(std::chrono::duration_cast<std::chrono::milliseconds>(
-                                               std::chrono::steady_clock::now() - started)
-                                               .count()));
-        // ptp4l refuses TIME and UTC_PROPERTIES: the read fails with the rest in the bag.
-        if (clock.impl == "ptp4l") {
-            EXPECT_EQ(result, E_FAIL);
-            Held<IkxSysPropertyBag> refused;
-            EXPECT_EQ(hosted.read(clock, {kxQvTime}, refused), E_FAIL);
-            EXPECT_EQ(hosted.read(clock, {kxQvLeap59}, refused), E_FAIL);
+        // A port may change state between pmc's read and ours: up to three rounds.
+        std::string differences = "not read";
+        for (int round = 0; round < 3 && !differences.empty(); ++round) {
+            std::map<std::string, std::map<std::string, std::string>> pmc;
+            for (const auto& [tag, managementId, name] : kComparisons) {
+                if (pmc.count(managementId) == 0) {
+                    pmc[managementId] = pmcValues(network, clock, managementId);
+                }
+            }
+            Held<IkxSysPropertyBag> bag;
+            // ptp4l refuses TIME and UTC_PROPERTIES: the read fails, the rest in the bag.
+            EXPECT_EQ(hosted.read(clock, readableTags(), bag),
+                      clock.impl == "ptp4l" ? E_FAIL : S_OK);
+            differences.clear();
+            for (const auto& [tag, managementId, name] : kComparisons) {
+                const std::string ours = canonical(textOf(*bag.p, tag));
+                const std::string theirs = canonical(pmc[managementId][name]);
+                differences +=
+                    ours == theirs ? "" : std::string(name) + ": " + ours + " vs " + theirs + "; ";
+            }
         }
-        for (const Comparison& c : kComparisons) {
-            SCOPED_TRACE(c.name);
-            EXPECT_EQ(textOf(*bag.p, c.tag),
-                      c.expected(pmcValues(network, clock, c.managementId), c.name));
-        }
+        EXPECT_EQ(differences, "");
+        Held<IkxSysPropertyBag> refused;
+        const HRESULT refusal = clock.impl == "ptp4l" ? E_FAIL : S_OK;
+        EXPECT_EQ(hosted.read(clock, {kxQvTime}, refused), refusal);
+        EXPECT_EQ(hosted.read(clock, {kxQvLeap59}, refused), refusal);
     }
 }
 
