@@ -43,7 +43,8 @@ class tUDPNetworkInterface final : public iPTPPortMessaging {
     // In compatibility mode the unit is first padded with zero octets to 124 octets.
     void sendEventMessage(tProtocolDataUnit& unit, tStatus& status) override;
     void sendGeneralMessage(tProtocolDataUnit& unit, tStatus& status) override;
-    // A datagram longer than 1024 octets is consumed and gives -52003.
+    // A datagram longer than 1024 octets is consumed and gives -52003 with the reason
+    // tStatusReason::tKind::kBadDatagram: unlike a failing socket, reading may go on at once.
     void receive(tProtocolDataUnit& unit, tStatus& status) override;
     void abortReceive(tStatus& status) override;
     tPortAddress getPortAddress() override;
@@ -70,6 +71,7 @@ class tUDPNetworkInterface final : public iPTPPortMessaging {
     std::uint32_t localInterfaceAddress_ = 0;  // network byte order; 0 is any interface
     std::atomic<bool> padEventMessages_{false};
     std::atomic<int> wakeEvent_{-1};  // an eventfd that abortReceive and close signal
+    int lastSocket_ = -1;             // the socket read last; the receiving thread's only
 
     std::mutex receiveLock_;  // guards activeReceives_ and closing_
     std::condition_variable receiveIdle_;
