@@ -30,7 +30,7 @@ class tUDPNetworkInterface final : public iPTPPortMessaging {
     static constexpr int kWaitStepMilliseconds = 500;
     static constexpr std::uint64_t kCompatibilityLength = 124;
     // Room in the kernel for a burst of answers (a thousand clocks answering one discovery,
-    // about 1.3 MB as the kernel counts them) while the receive thread decodes. Kept at
+    // one to two megabytes as the kernel counts them) while the receive thread decodes. Kept at
     // 4 MiB because the receive loop drains it fast: it drops a bad datagram without a pause
     // (tests/bench/BadDatagramBench: some 20,000 to 70,000 a second here), so even a queue
     // filled by a flood (a few thousand datagrams) is read within a fraction of a second,
