@@ -4,6 +4,7 @@
 #include <optional>
 
 #include "platform/BStr.h"
+#include "platform/tStatusReason.h"
 
 namespace {
 
@@ -20,7 +21,12 @@ std::u16string widened(const std::string& text) {
     return std::u16string(text.begin(), text.end());
 }
 
+// The exchange's own reason when it carries one ("refused by the clock: NOT_SUPPORTED").
 std::string causeOf(const tStatus& status) {
+    const std::string reason = tStatusReason::describe(status);
+    if (!reason.empty()) {
+        return reason;
+    }
     switch (status.code) {
         case kStatusNoData:
             return "no valid answer came from the clock";

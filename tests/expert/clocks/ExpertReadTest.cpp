@@ -64,9 +64,9 @@ TEST_F(ExpertFixture, OneRequestPerSourceInSourceOrderAndTheResultSaysWhatWasSer
     BSTR description = nullptr;
     BSTR trace = nullptr;
     EXPECT_EQ(why->GetLastFailure(&description, &trace), S_OK);
-    EXPECT_EQ(
-        std::u16string(description),
-        u"reading the clock's attributes: no valid answer came from the clock (status -52012)");
+    EXPECT_EQ(std::u16string(description),
+              u"reading the clock's attributes: refused by the clock: GENERAL_ERROR (Failure "
+              u"getting value) (status -52012)");
     EXPECT_EQ(std::u16string(trace).substr(0, 12), u"[qvptpmgmt--");  // as the record keeps it
     SysFreeString(description);
     SysFreeString(trace);
