@@ -268,7 +268,7 @@ inline ULONG SysStringLen(const OLECHAR* text) {
         std::memcpy(&octets, reinterpret_cast<const std::uint8_t*>(text) - sizeof octets,
                     sizeof octets);
     }
-    return octets / sizeof(OLECHAR);
+    return static_cast<ULONG>(octets / sizeof(OLECHAR));
 }
 
 // The attribute tags that the expert reads, sets or writes. The kxQv tags are the expert's
