@@ -60,13 +60,6 @@ TEST_F(ExpertFixture, MisuseGivesCodesNotCrashes) {
     EXPECT_EQ(expert->UseTransport(other), QV_E_ALREADY_INITIALIZED);
     EXPECT_EQ(expert->GetItemProperties(kPort1, 1, nullptr, nullptr, bag.Receive()), E_POINTER);
     EXPECT_EQ(expert->GetItem(kPort1, nullptr), E_POINTER);
-    GUID identifier{};
-    BSTR version = nullptr;
-    EXPECT_EQ(expert->GetExpertGUID(&identifier), S_OK);
-    EXPECT_EQ(identifier, CLSID_QvPtpSysExpert);
-    EXPECT_EQ(expert->GetVersionString(&version), S_OK);
-    EXPECT_EQ(std::u16string(version), u"1.0.2");
-    SysFreeString(version);
 }
 
 TEST(ItemName, ParsesAsTheHostWritesIt) {
