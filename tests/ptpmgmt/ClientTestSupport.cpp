@@ -64,10 +64,4 @@ bool eventually(const std::function<bool()>& condition) {
     return true;
 }
 
-double millisecondsOf(const std::function<void()>& action) {
-    const auto start = tSteadyClock::now();
-    action();
-    return std::chrono::duration<double, std::milli>(tSteadyClock::now() - start).count();
-}
-
 }  // namespace qvtest

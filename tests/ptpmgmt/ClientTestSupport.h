@@ -40,9 +40,6 @@ bool isManagementComponent(const tStatus& status);
 // Polls `condition` every millisecond for up to two seconds; whether it came true.
 bool eventually(const std::function<bool()>& condition);
 
-// Milliseconds that `action` took.
-double millisecondsOf(const std::function<void()>& action);
-
 }  // namespace qvtest
 
 #endif

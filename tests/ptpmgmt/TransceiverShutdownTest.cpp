@@ -5,6 +5,7 @@
 #include <condition_variable>
 #include <mutex>
 #include <thread>
+#include <vector>
 
 #include "ptp/transport/iPTPPortMessaging.h"
 #include "ptpmgmt/tMgmtMsgTransceiver.h"
@@ -23,7 +24,7 @@ class HeldSendTransport final : public nQVPTP000::iPTPPortMessaging {
   public:
     void open(tStatus&) override { aborted_ = false; }
     void close(tStatus&) override {
-        closed_ = true;
+        ++closes_;
         if (sending_) {
             closedDuringSend_ = true;
         }
@@ -53,7 +54,7 @@ class HeldSendTransport final : public nQVPTP000::iPTPPortMessaging {
     }
 
     std::atomic<bool> sending_{false};
-    std::atomic<bool> closed_{false};
+    std::atomic<int> closes_{0};
     std::atomic<bool> closedDuringSend_{false};
 
   private:
@@ -63,7 +64,9 @@ class HeldSendTransport final : public nQVPTP000::iPTPPortMessaging {
     bool release_ = false;
 };
 
-TEST(TransceiverShutdownTest, StopClosesTheTransportOnlyAfterASendInProgressHasFinished) {
+// Starts the transceiver, holds a send inside the transport and runs `stoppers` stops at
+// once; the send is released while they wait for it.
+void stopDuringASend(int stoppers) {
     HeldSendTransport transport;
     tStatus status;
     tMgmtMsgTransceiver transceiver(&transport, qvtest::clientIdentity(), qvtest::kClientPort,
@@ -79,19 +82,33 @@ TEST(TransceiverShutdownTest, StopClosesTheTransportOnlyAfterASendInProgressHasF
     while (!transport.sending_) {
         std::this_thread::sleep_for(1ms);
     }
-    std::thread stopper([&] {
-        tStatus stopStatus;
-        transceiver.stop(stopStatus);
-    });
+    std::vector<std::thread> stops;
+    for (int i = 0; i < stoppers; ++i) {
+        stops.emplace_back([&] {
+            tStatus stopStatus;
+            transceiver.stop(stopStatus);
+            EXPECT_TRUE(stopStatus.succeeded());
+        });
+    }
     // Long enough for an unguarded stop to reach close while the send is held.
     std::this_thread::sleep_for(100ms);
-    EXPECT_FALSE(transport.closed_);
+    EXPECT_EQ(transport.closes_, 0);
     transport.releaseSend();
     sender.join();
-    stopper.join();
-    EXPECT_TRUE(transport.closed_);
+    for (std::thread& stop : stops) {
+        stop.join();
+    }
+    EXPECT_EQ(transport.closes_, 1);
     EXPECT_FALSE(transport.closedDuringSend_);
     EXPECT_FALSE(transceiver.isRunning());
+}
+
+TEST(TransceiverShutdownTest, StopClosesTheTransportOnlyAfterASendInProgressHasFinished) {
+    stopDuringASend(1);
+}
+
+TEST(TransceiverShutdownTest, TwoStopsAtOnceCloseTheTransportOnce) {
+    stopDuringASend(2);
 }
 
 }  // namespace
