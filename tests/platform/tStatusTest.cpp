@@ -17,6 +17,7 @@ TEST(tStatusTest, TheFirstErrorWinsOverWarningsAndLaterErrors) {
     EXPECT_TRUE(status.set(-52000, "qvptp3u", "first.cpp", 10));
     EXPECT_FALSE(status.set(-52012, "other", "second.cpp", 20));
     EXPECT_FALSE(status.set(0, "c", "f", 4));
+    EXPECT_FALSE(status.set(9, "c", "f", 5));
     EXPECT_EQ(status.code, -52000);
     EXPECT_STREQ(status.component, "qvptp3u");
     EXPECT_STREQ(status.file, "first.cpp");
