@@ -53,6 +53,13 @@ bool isManagementComponent(const tStatus& status) {
            0;
 }
 
+bool discoverAll(nQVPTPMGMT000::tPTPMgmtNode& node, std::uint16_t count, tStatus& status) {
+    for (int round = 0; round < 100 && node.clockCount() < count && status.succeeded(); ++round) {
+        node.findClocks(20, status);
+    }
+    return node.clockCount() == count;
+}
+
 bool eventually(const std::function<bool()>& condition) {
     const auto deadline = tSteadyClock::now() + std::chrono::seconds(2);
     while (!condition()) {

@@ -133,8 +133,7 @@ TEST_F(tPTPClockProxyTest, AssignTakesTargetAndDomainButNotTheDescription) {
     SimulatedClock other(clockIdentity(9), 1, 2);
     other.managed().port(1).physicalAddress = {0x0A, 0x0B};
     network_.attach(other);
-    node_.findClocks(20, status_);
-    ASSERT_EQ(node_.clockCount(), 3);
+    ASSERT_TRUE(discoverAll(node_, 3, status_));
     const std::uint8_t* key = nullptr;
     nQVPTPMGMT000::iPTPClockProxy* found[3] = {};
     node_.copyClockProxies(found, 3, status_);
@@ -179,9 +178,11 @@ TEST_F(tPTPClockProxyTest, RefreshReplacesTheCachedDescriptionOnSuccessOnly) {
     // A later discovery replaces a refreshed description in turn.
     clock_.setFault(Fault::none);
     managed().port(1).productDescription = text("rediscovered");
-    node_.findClocks(20, status);
-    proxy().getProductDescription(product, sizeof(product), status);
-    EXPECT_STREQ(product, "rediscovered");
+    EXPECT_TRUE(eventually([&] {
+        node_.findClocks(20, status);
+        proxy().getProductDescription(product, sizeof(product), status);
+        return std::string(product) == "rediscovered";
+    }));
     EXPECT_TRUE(status.succeeded());
 }
 

@@ -22,7 +22,9 @@ namespace {
 constexpr auto kGet = tManagementMessagePayload::kGet;
 constexpr auto kSet = tManagementMessagePayload::kSet;
 constexpr auto kCommand = tManagementMessagePayload::kCommand;
-constexpr std::uint16_t kDiscoveryMs = 30;
+// Long enough for the receive thread to store the answers on a loaded machine: these tests
+// count what one discovery sent and found.
+constexpr std::uint16_t kDiscoveryMs = 100;
 
 nQVPTP000::tPTPText text(const char* value) {
     tStatus status;
