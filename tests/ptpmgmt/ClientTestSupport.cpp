@@ -61,7 +61,7 @@ bool discoverAll(nQVPTPMGMT000::tPTPMgmtNode& node, std::uint16_t count, tStatus
 }
 
 bool eventually(const std::function<bool()>& condition) {
-    const auto deadline = tSteadyClock::now() + std::chrono::seconds(2);
+    const auto deadline = tSteadyClock::now() + std::chrono::seconds(10);
     while (!condition()) {
         if (tSteadyClock::now() > deadline) {
             return false;

@@ -42,7 +42,7 @@ bool isManagementComponent(const tStatus& status);
 // short discovery may end before a loaded machine has run the receive thread.
 bool discoverAll(nQVPTPMGMT000::tPTPMgmtNode& node, std::uint16_t count, tStatus& status);
 
-// Polls `condition` every millisecond for up to two seconds; whether it came true.
+// Polls `condition` every millisecond for up to ten seconds; whether it came true.
 bool eventually(const std::function<bool()>& condition);
 
 }  // namespace qvtest
