@@ -1,8 +1,12 @@
 #include <gtest/gtest.h>
+#include <sys/resource.h>
+#include <unistd.h>
 
 #include <atomic>
 #include <chrono>
 #include <condition_variable>
+#include <cstdlib>
+#include <fstream>
 #include <mutex>
 #include <thread>
 #include <vector>
@@ -10,6 +14,7 @@
 #include "ptp/transport/iPTPPortMessaging.h"
 #include "ptpmgmt/tMgmtMsgTransceiver.h"
 #include "tests/ptpmgmt/ClientTestSupport.h"
+#include "tests/support/ptpmgmt/SimulatedNetwork.h"
 
 using nQVPTP000::tManagementMessagePayload;
 using nQVPTP000::tProtocolDataUnit;
@@ -110,5 +115,30 @@ TEST(TransceiverShutdownTest, StopClosesTheTransportOnlyAfterASendInProgressHasF
 TEST(TransceiverShutdownTest, TwoStopsAtOnceCloseTheTransportOnce) {
     stopDuringASend(2);
 }
+
+// Without room for a thread's stack the receive thread cannot start: start reports it and
+// leaves the transport closed. The address space limit is set in a child process only.
+#if !defined(__SANITIZE_ADDRESS__) && !defined(__SANITIZE_THREAD__)
+bool startFailsWithoutRoomForAThread() {
+    qvtest::SimulatedNetwork network;
+    tStatus status;
+    tMgmtMsgTransceiver transceiver(&network, qvtest::clientIdentity(), qvtest::kClientPort,
+                                    status);
+    long pages = 0;
+    std::ifstream("/proc/self/statm") >> pages;
+    const rlimit tight{static_cast<rlim_t>(pages * sysconf(_SC_PAGESIZE)) + (1U << 20),
+                       RLIM_INFINITY};
+    setrlimit(RLIMIT_AS, &tight);
+    transceiver.start(status);
+    return status.code == kStatusOsObjectError && !network.isOpen() && !transceiver.isRunning();
+}
+
+TEST(TransceiverStartTest, AReceiveThreadThatCannotStartFailsStart) {
+    // A fresh process: one that has run threads keeps their stacks for new ones.
+    GTEST_FLAG_SET(death_test_style, "threadsafe");
+    EXPECT_EXIT(std::_Exit(startFailsWithoutRoomForAThread() ? 0 : 1), ::testing::ExitedWithCode(0),
+                "");
+}
+#endif
 
 }  // namespace
