@@ -99,6 +99,7 @@ TEST(tThreadControllerTest, TraceNamesStateAndPriority) {
         traced(controller), std::regex(R"(tThreadController \(\*0x[0-9a-f]{16}\) ID 0x[0-9a-f]{8} )"
                                        R"(is running at default priority\.\n)")));
     runnable.released = true;
+    controller.join();  // before the runnable, declared later, goes
 }
 
 TEST(tThreadControllerTest, DestructorWaitsForTheThread) {
