@@ -13,7 +13,7 @@
 #include <cstdlib>
 #include <string>
 
-#include "tests/network/BurstResponder.h"
+#include "tests/bench/BurstResponder.h"
 #include "tests/network/ManagementClient.h"
 #include "tests/support/TestNetwork.h"
 

@@ -2,7 +2,6 @@
 #include <signal.h>
 
 #include <algorithm>
-#include <chrono>
 #include <cstring>
 #include <string>
 #include <vector>
@@ -48,13 +47,8 @@ TEST(Discovery, FindsEveryClockOnceInKeyOrderInItsDomainAndKeepsAStoppedOne) {
     ASSERT_TRUE(client.isOpen()) << client.failure();
 
     tStatus status;
-    const auto started = std::chrono::steady_clock::now();
     std::vector<tPTPClockProxy*> proxies = client.findClocks(1000, status);
-    const auto took = std::chrono::steady_clock::now() - started;
     ASSERT_TRUE(status.succeeded()) << status.code;
-    // The discovery waits its time-out and not much longer.
-    EXPECT_GE(took, std::chrono::milliseconds(1000));
-    EXPECT_LT(took, std::chrono::milliseconds(1500));
 
     const std::vector<qvtest::TestClock> expected = inKeyOrder(network.clocks());
     ASSERT_EQ(proxies.size(), expected.size());
@@ -83,20 +77,6 @@ TEST(Discovery, FindsEveryClockOnceInKeyOrderInItsDomainAndKeepsAStoppedOne) {
         client.node().findClock(qvtest::clockKeyOf(*stopped), read);
     ASSERT_NE(kept, nullptr);
     EXPECT_EQ(cachedUserDescription(static_cast<tPTPClockProxy&>(*kept)), "three");
-}
-
-TEST(Discovery, DefaultDomainFindsOnlyTheDomainZeroClock) {
-    QV_REQUIRE_TEST_NETWORK("ptp4l", "ptpd", "pmc");
-    TestNetwork network({kClocks[0], kClocks[1]});
-    ASSERT_TRUE(network.isUp()) << network.failure();
-    ManagementClient client(network.clientNamespace());
-    ASSERT_TRUE(client.isOpen()) << client.failure();
-
-    tStatus status;
-    client.node().findClocksInDefaultDomain(500, status);
-    ASSERT_TRUE(status.succeeded()) << status.code;
-    ASSERT_EQ(client.node().clockCount(), 1u);
-    EXPECT_NE(client.node().findClock(qvtest::clockKeyOf(network.clocks()[0]), status), nullptr);
 }
 
 }  // namespace

@@ -69,17 +69,6 @@ std::string describe(const tStatus& status) {
     return std::to_string(status.code) + " at " + status.file + ":" + std::to_string(status.line);
 }
 
-std::chrono::milliseconds timeOf(const std::function<void(tStatus&)>& call, tStatus& status) {
-    const auto started = std::chrono::steady_clock::now();
-    call(status);
-    return std::chrono::duration_cast<std::chrono::milliseconds>(std::chrono::steady_clock::now() -
-                                                                 started);
-}
-
-long pmcNumber(const std::string& text) {
-    return std::stol(text, nullptr, text.rfind("0x", 0) == 0 ? 16 : 10);
-}
-
 std::map<std::string, std::string> pmcGet(const TestNetwork& network, const TestClock& clock,
                                           const std::string& managementId, int domain) {
     const int asked = domain < 0 ? clock.domain : domain;

@@ -2,9 +2,7 @@
 #define QV_TESTS_NETWORK_MANAGEMENTCLIENT_H
 
 #include <array>
-#include <chrono>
 #include <cstdint>
-#include <functional>
 #include <map>
 #include <memory>
 #include <string>
@@ -67,12 +65,6 @@ std::string pmcPortIdentity(const TestClock& clock);
 
 // A status for a failure message: "-52012 at file.cpp:120".
 std::string describe(const tStatus& status);
-
-// How long a call took: exchanges that fail on an error answer must fail at once.
-std::chrono::milliseconds timeOf(const std::function<void(tStatus&)>& call, tStatus& status);
-
-// A numeric value as pmc prints it: decimal, or hexadecimal with "0x".
-long pmcNumber(const std::string& text);
 
 }  // namespace qvtest
 

@@ -21,21 +21,20 @@ std::string padded(const std::string& fields) {
     return fields + std::string(49 - fields.size(), '-') + "] ";
 }
 
-TEST_F(tTraceTest, DefaultHeaderNamesComponentLineAndFileOnly) {
+// The default header names component, line and file (without folders), padded with dashes
+// to 49 characters or cut there; version and code follow when asked for; with no field at
+// all the header is blank.
+TEST_F(tTraceTest, HeaderFieldsAreJoinedPaddedAndCut) {
     trace.beginLine("qvptp3u", 105, "C:\\src/ptp\\factory.cpp", 105, 0).append("hello").endLine();
     EXPECT_EQ(destination.text(), padded("[qvptp3u--105--factory.cpp") + "hello\n");
     ASSERT_EQ(destination.pieces().size(), 1U);
-}
 
-TEST_F(tTraceTest, HeaderLongerThan49IsCut) {
+    destination.clear();
     const std::string file = "tOrganizationExtensionTLVFactory.cpp";
     trace.beginLine("qvptp3u", 105, file.c_str(), 105, 0).endLine();
-    const std::string full = "[qvptp3u--105--" + file;
-    EXPECT_EQ(destination.text(), full.substr(0, 49) + "] \n");
-}
+    EXPECT_EQ(destination.text(), ("[qvptp3u--105--" + file).substr(0, 49) + "] \n");
 
-// Version and code follow the default fields; with no field at all the header is blank.
-TEST_F(tTraceTest, OptionalFieldsFollowInTheirOrderAndNoFieldsGiveABlank) {
+    destination.clear();
     trace.setFlag(tTrace::Flag::showVersion, true).setFlag(tTrace::Flag::showCode, true);
     trace.beginLine("c", 7, "f.cpp", -3, 0).endLine();
     EXPECT_EQ(destination.text(), padded("[c--v1.0--7--f.cpp---3") + "\n");

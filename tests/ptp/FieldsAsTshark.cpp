@@ -133,8 +133,8 @@ bool as(const tTLV& tlv, Describe describe) {
 void clockDescription(TsharkFields& f, const tClockDescriptionTLV& t) {
     const tPortAddress address = t.getProtocolAddress();
     add(f, "ptp.v2.mm.", "clockType.OC", t.getOrdinaryClock(), "clockType.BC", t.getBoundaryClock(),
-        "clockType.p2p_TC", t.getP2pTransparentClock(), "clockType.e2e_TC",
-        t.getE2eTransparentClock(), "clockType.MM", t.getManagementNode(), "physicalLayerProtocol",
+        "clockType.p2p_TC", t.getP2PTransparentClock(), "clockType.e2e_TC",
+        t.getE2ETransparentClock(), "clockType.MM", t.getManagementNode(), "physicalLayerProtocol",
         t.getPhysicalLayerProtocol(), "physicalAddressLength", t.getPhysicalAddressLength(),
         "physicalAddress", t.getPhysicalAddress(), "networkProtocol", address.getNetworkProtocol(),
         "protocolAddress", std::span(address.getAddressField(), address.getAddressLength()),

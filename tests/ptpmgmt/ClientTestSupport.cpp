@@ -53,8 +53,15 @@ bool isManagementComponent(const tStatus& status) {
            0;
 }
 
+bool discoverAll(nQVPTPMGMT000::tPTPMgmtNode& node, std::uint16_t count, tStatus& status) {
+    for (int round = 0; round < 100 && node.clockCount() < count && status.succeeded(); ++round) {
+        node.findClocks(20, status);
+    }
+    return node.clockCount() == count;
+}
+
 bool eventually(const std::function<bool()>& condition) {
-    const auto deadline = tSteadyClock::now() + std::chrono::seconds(2);
+    const auto deadline = tSteadyClock::now() + std::chrono::seconds(10);
     while (!condition()) {
         if (tSteadyClock::now() > deadline) {
             return false;
@@ -62,12 +69,6 @@ bool eventually(const std::function<bool()>& condition) {
         std::this_thread::sleep_for(std::chrono::milliseconds(1));
     }
     return true;
-}
-
-double millisecondsOf(const std::function<void()>& action) {
-    const auto start = tSteadyClock::now();
-    action();
-    return std::chrono::duration<double, std::milli>(tSteadyClock::now() - start).count();
 }
 
 }  // namespace qvtest

@@ -11,6 +11,7 @@
 #include "ptp/tClockIdentity.h"
 #include "ptp/tManagementMessage.h"
 #include "ptp/tPortIdentity.h"
+#include "ptpmgmt/tPTPMgmtNode.h"
 
 namespace qvtest {
 
@@ -37,11 +38,12 @@ std::unique_ptr<nQVPTP000::tManagementMessage> nullRequest(std::uint32_t actionF
 // the record's component field holds the name).
 bool isManagementComponent(const tStatus& status);
 
-// Polls `condition` every millisecond for up to two seconds; whether it came true.
-bool eventually(const std::function<bool()>& condition);
+// Discovers until the node knows `count` ports (at most 100 rounds of 20 ms): a single
+// short discovery may end before a loaded machine has run the receive thread.
+bool discoverAll(nQVPTPMGMT000::tPTPMgmtNode& node, std::uint16_t count, tStatus& status);
 
-// Milliseconds that `action` took.
-double millisecondsOf(const std::function<void()>& action);
+// Polls `condition` every millisecond for up to ten seconds; whether it came true.
+bool eventually(const std::function<bool()>& condition);
 
 }  // namespace qvtest
 

@@ -33,8 +33,7 @@ TEST(ConcurrentExchangesTest, EachThreadGetsItsOwnClocksAnswers) {
     tStatus status;
     tPTPMgmtNode node(&network, clientIdentity(), kClientPort, status);
     node.open(status);
-    node.findClocks(20, status);
-    ASSERT_EQ(node.clockCount(), kClocks);
+    ASSERT_TRUE(discoverAll(node, kClocks, status));
     std::vector<iPTPClockProxy*> proxies(kClocks);
     node.copyClockProxies(proxies.data(), kClocks, status);
     ASSERT_TRUE(status.succeeded());

@@ -20,9 +20,8 @@ class ProxyFixture : public ::testing::Test {
     void SetUp() override {
         network_.attach(clock_);
         node_.open(status_);
-        node_.findClocks(20, status_);
+        ASSERT_TRUE(discoverAll(node_, 2, status_));
         ASSERT_TRUE(status_.succeeded());
-        ASSERT_EQ(node_.clockCount(), 2);
         nQVPTPMGMT000::iPTPClockProxy* found[2] = {};
         node_.copyClockProxies(found, 2, status_);
         proxy_ = static_cast<nQVPTPMGMT000::tPTPClockProxy*>(found[0]);

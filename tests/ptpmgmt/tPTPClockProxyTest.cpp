@@ -86,34 +86,32 @@ TEST_F(tPTPClockProxyTest, TextsNeedRoomForTheirTerminatingZero) {
     EXPECT_TRUE(status_.succeeded());
 }
 
+// A buffer one octet short gets nothing; one of the field's size gets the field only.
 TEST_F(tPTPClockProxyTest, OctetFieldsNeedTheirWholeSize) {
     EXPECT_EQ(proxy().getPhysicalAddressLength(), 6);
-    std::uint8_t octets[8];
-    std::memset(octets, 0xEE, sizeof(octets));
-    proxy().getPhysicalAddress(octets, 5, status_);
-    EXPECT_EQ(status_.code, kStatusNoData);
-    EXPECT_EQ(octets[0], 0xEE);
-    status_.reset();
-    proxy().getPhysicalAddress(octets, 6, status_);
-    EXPECT_EQ(std::vector<std::uint8_t>(octets, octets + 7),
-              (std::vector<std::uint8_t>{0x02, 0x11, 0x22, 0x33, 0x44, 0x55, 0xEE}));
-
-    std::memset(octets, 0xEE, sizeof(octets));
-    proxy().getManufacturerIdentity(octets, 2, status_);
-    EXPECT_EQ(status_.code, kStatusNoData);
-    EXPECT_EQ(octets[0], 0xEE);
-    status_.reset();
-    proxy().getManufacturerIdentity(octets, 3, status_);
-    EXPECT_EQ(std::vector<std::uint8_t>(octets, octets + 4),
-              (std::vector<std::uint8_t>{0x00, 0x1B, 0x19, 0xEE}));
-
-    proxy().getProfileIdentity(octets, 5, status_);
-    EXPECT_EQ(status_.code, kStatusNoData);
-    status_.reset();
-    proxy().getProfileIdentity(octets, 6, status_);
-    EXPECT_EQ(std::vector<std::uint8_t>(octets, octets + 6),
-              (std::vector<std::uint8_t>{0x00, 0x1B, 0x19, 0x00, 0x01, 0x00}));
-    EXPECT_TRUE(status_.succeeded());
+    using tOctetReader = void (tPTPClockProxy::*)(std::uint8_t*, std::uint16_t, tStatus&) const;
+    struct {
+        tOctetReader read;
+        std::vector<std::uint8_t> field;
+    } const cases[] = {
+        {&tPTPClockProxy::getPhysicalAddress, {0x02, 0x11, 0x22, 0x33, 0x44, 0x55}},
+        {&tPTPClockProxy::getManufacturerIdentity, {0x00, 0x1B, 0x19}},
+        {&tPTPClockProxy::getProfileIdentity, {0x00, 0x1B, 0x19, 0x00, 0x01, 0x00}},
+    };
+    for (const auto& c : cases) {
+        const auto size = static_cast<std::uint16_t>(c.field.size());
+        std::vector<std::uint8_t> octets(size + 1U, 0xEE);
+        tStatus status;
+        (proxy().*c.read)(octets.data(), static_cast<std::uint16_t>(size - 1), status);
+        EXPECT_EQ(status.code, kStatusNoData);
+        EXPECT_EQ(octets, std::vector<std::uint8_t>(size + 1U, 0xEE));
+        status.reset();
+        (proxy().*c.read)(octets.data(), size, status);
+        std::vector<std::uint8_t> expected = c.field;
+        expected.push_back(0xEE);
+        EXPECT_EQ(octets, expected);
+        EXPECT_TRUE(status.succeeded());
+    }
 }
 
 TEST_F(tPTPClockProxyTest, ClockKeyIsTheIdentityThenThePortNumberHighOctetFirst) {
@@ -135,8 +133,7 @@ TEST_F(tPTPClockProxyTest, AssignTakesTargetAndDomainButNotTheDescription) {
     SimulatedClock other(clockIdentity(9), 1, 2);
     other.managed().port(1).physicalAddress = {0x0A, 0x0B};
     network_.attach(other);
-    node_.findClocks(20, status_);
-    ASSERT_EQ(node_.clockCount(), 3);
+    ASSERT_TRUE(discoverAll(node_, 3, status_));
     const std::uint8_t* key = nullptr;
     nQVPTPMGMT000::iPTPClockProxy* found[3] = {};
     node_.copyClockProxies(found, 3, status_);
@@ -181,9 +178,11 @@ TEST_F(tPTPClockProxyTest, RefreshReplacesTheCachedDescriptionOnSuccessOnly) {
     // A later discovery replaces a refreshed description in turn.
     clock_.setFault(Fault::none);
     managed().port(1).productDescription = text("rediscovered");
-    node_.findClocks(20, status);
-    proxy().getProductDescription(product, sizeof(product), status);
-    EXPECT_STREQ(product, "rediscovered");
+    EXPECT_TRUE(eventually([&] {
+        node_.findClocks(20, status);
+        proxy().getProductDescription(product, sizeof(product), status);
+        return std::string(product) == "rediscovered";
+    }));
     EXPECT_TRUE(status.succeeded());
 }
 

@@ -2,9 +2,6 @@
 
 #include <gtest/gtest.h>
 
-#include <cstring>
-
-#include "ptp/TLVs/tClockDescriptionTLV.h"
 #include "ptp/TLVs/tNullManagementTLV.h"
 #include "ptp/TLVs/tPriority1TLV.h"
 #include "ptp/tMessageHeader.h"
@@ -16,9 +13,7 @@ using nQVPTP000::tManagementMessage;
 using nQVPTP000::tManagementMessagePayload;
 using nQVPTP000::tPortIdentity;
 using nQVPTPMGMT000::iPTPClockProxy;
-using nQVPTPMGMT000::tClockKey;
 using nQVPTPMGMT000::tPTPClockProxy;
-using nQVPTPMGMT000::tPTPMgmtNode;
 using namespace qvtest;
 using Fault = SimulatedClock::Fault;
 
@@ -27,11 +22,20 @@ namespace {
 constexpr auto kGet = tManagementMessagePayload::kGet;
 constexpr auto kSet = tManagementMessagePayload::kSet;
 constexpr auto kCommand = tManagementMessagePayload::kCommand;
-constexpr std::uint16_t kDiscoveryMs = 30;
+// Long enough for the receive thread to store the answers on a loaded machine: these tests
+// count what one discovery sent and found.
+constexpr std::uint16_t kDiscoveryMs = 100;
 
 nQVPTP000::tPTPText text(const char* value) {
     tStatus status;
     return nQVPTP000::tPTPText(value, status);
+}
+
+std::string productOf(const tPTPClockProxy& proxy) {
+    char product[32] = {};
+    tStatus status;
+    proxy.getProductDescription(product, sizeof(product), status);
+    return status.succeeded() ? product : "(" + std::to_string(status.code) + ")";
 }
 
 class tPTPMgmtNodeTest : public ::testing::Test {
@@ -56,23 +60,25 @@ class tPTPMgmtNodeTest : public ::testing::Test {
         return concrete;
     }
     // One exchange with port 1 of clock 1 in domain 0.
-    std::unique_ptr<tManagementMessage> exchange(std::unique_ptr<tManagementMessagePayload> payload,
-                                                 std::uint32_t action, std::uint16_t timeoutMs) {
-        return node_.sendAndAwait(tPortIdentity(clockIdentity(1), 1), std::move(payload), action,
-                                  timeoutMs, 0, status_);
+    std::unique_ptr<tManagementMessage> exchange(std::uint16_t timeoutMs,
+                                                 std::uint32_t action = kGet,
+                                                 tStatus* status = nullptr) {
+        return node_.sendAndAwait(tPortIdentity(clockIdentity(1), 1),
+                                  std::make_unique<nQVPTP000::tPriority1TLV>(), action, timeoutMs,
+                                  0, status ? *status : status_);
     }
 
     tStatus status_;
     SimulatedNetwork network_;
     std::vector<std::unique_ptr<SimulatedClock>> clocks_;
-    tPTPMgmtNode node_{&network_, clientIdentity(), kClientPort, status_};
+    nQVPTPMGMT000::tPTPMgmtNode node_{&network_, clientIdentity(), kClientPort, status_};
 };
 
 TEST_F(tPTPMgmtNodeTest, DiscoveryAsksAllClocksInDomainsZeroToThree) {
     addClock(1);
-    const double took = millisecondsOf([&] { node_.findClocks(kDiscoveryMs, status_); });
+    addClock(2, 1, 3);
+    node_.findClocks(kDiscoveryMs, status_);
     ASSERT_TRUE(status_.succeeded());
-    EXPECT_GE(took, kDiscoveryMs);
     const auto sent = network_.sentDatagrams();
     ASSERT_EQ(sent.size(), 4U);
     for (std::uint8_t domain = 0; domain < 4; ++domain) {
@@ -85,7 +91,7 @@ TEST_F(tPTPMgmtNodeTest, DiscoveryAsksAllClocksInDomainsZeroToThree) {
         EXPECT_EQ(request->getHeader()->getSourcePortIdentity(), clientPort());
         EXPECT_EQ(request->getPayload(status_)->getManagementId(), 0x0001);
     }
-    EXPECT_EQ(node_.clockCount(), 1);
+    EXPECT_EQ(node_.clockCount(), 2);
 }
 
 TEST_F(tPTPMgmtNodeTest, DiscoveryInTheDefaultDomainSendsOneRequest) {
@@ -96,7 +102,7 @@ TEST_F(tPTPMgmtNodeTest, DiscoveryInTheDefaultDomainSendsOneRequest) {
     EXPECT_EQ(node_.clockCount(), 1);
 }
 
-TEST_F(tPTPMgmtNodeTest, EachPortBecomesAProxyInKeyOrder) {
+TEST_F(tPTPMgmtNodeTest, EachPortBecomesAProxyInKeyOrderFoundAndRemovedByKey) {
     addClock(2, 2);
     addClock(1);
     node_.findClocks(kDiscoveryMs, status_);
@@ -106,71 +112,65 @@ TEST_F(tPTPMgmtNodeTest, EachPortBecomesAProxyInKeyOrder) {
     EXPECT_EQ(found[0]->getPortIdentity(), tPortIdentity(clockIdentity(1), 1));
     EXPECT_EQ(found[1]->getPortIdentity(), tPortIdentity(clockIdentity(2), 1));
     EXPECT_EQ(found[2]->getPortIdentity(), tPortIdentity(clockIdentity(2), 2));
-}
+    iPTPClockProxy* wrongCount[2] = {};
+    node_.copyClockProxies(wrongCount, 2, status_);
+    EXPECT_EQ(status_.code, kStatusNoData);
+    EXPECT_EQ(wrongCount[0], nullptr);
 
-TEST_F(tPTPMgmtNodeTest, AClockInTwoDomainsKeepsItsFirstDomainAndTheLastDescription) {
-    // One clock identity seen in domain 0 and in domain 3.
-    addClock(1, 1, 0).update(
-        [](auto& clock) { clock.port(1).productDescription = text("domain zero"); });
-    addClock(1, 1, 3).update(
-        [](auto& clock) { clock.port(1).productDescription = text("domain three"); });
-    node_.findClocks(kDiscoveryMs, status_);
-    const auto found = proxies();
-    ASSERT_EQ(found.size(), 1U);
-    EXPECT_EQ(found[0]->getDomainNumber(), 0);
-    char product[32] = {};
-    found[0]->getProductDescription(product, sizeof(product), status_);
-    EXPECT_STREQ(product, "domain three");
+    tStatus status;
+    const nQVPTPMGMT000::tClockKey key = {0x00, 0x11, 0x22, 0xFF, 0xFE,
+                                          0x33, 0x44, 0x02, 0x00, 0x02};
+    EXPECT_EQ(node_.findClock(key, status), found[2]);
+    node_.removeClock(found[2], status);
+    EXPECT_EQ(node_.clockCount(), 2);
+    EXPECT_TRUE(status.succeeded());
+    EXPECT_EQ(node_.findClock(key, status), nullptr);
+    EXPECT_EQ(status.code, kStatusNoData);
 }
 
 TEST_F(tPTPMgmtNodeTest, ALaterDiscoveryRefreshesDescriptionsAndKeepsSilentClocks) {
-    SimulatedClock& first = addClock(1);
+    // Clock 1 is seen in domains 0 and 3: it keeps its first domain and the last description.
+    addClock(1, 1, 0).update([](auto& c) { c.port(1).productDescription = text("domain zero"); });
+    addClock(1, 1, 3).update([](auto& c) { c.port(1).productDescription = text("domain three"); });
     SimulatedClock& second = addClock(2);
-    first.update([](auto& clock) { clock.port(1).productDescription = text("old"); });
-    second.update([](auto& clock) { clock.port(1).productDescription = text("second"); });
+    second.update([](auto& c) { c.port(1).productDescription = text("second"); });
     node_.findClocks(kDiscoveryMs, status_);
     const auto before = proxies();
-    first.update([](auto& clock) { clock.port(1).productDescription = text("new"); });
+    ASSERT_EQ(before.size(), 2U);
+    EXPECT_EQ(before[0]->getDomainNumber(), 0);
+    EXPECT_EQ(productOf(*before[0]), "domain three");
+
+    clocks_[1]->update([](auto& c) { c.port(1).productDescription = text("new"); });
     second.setFault(Fault::silent);
     node_.findClocks(kDiscoveryMs, status_);
-    ASSERT_EQ(node_.clockCount(), 2);
-    const auto after = proxies();
-    EXPECT_EQ(after, before);  // the same proxies
-    char product[16] = {};
-    after[0]->getProductDescription(product, sizeof(product), status_);
-    EXPECT_STREQ(product, "new");
-    after[1]->getProductDescription(product, sizeof(product), status_);
-    EXPECT_STREQ(product, "second");
+    EXPECT_EQ(proxies(), before);  // the same proxies
+    EXPECT_EQ(productOf(*before[0]), "new");
+    EXPECT_EQ(productOf(*before[1]), "second");
     EXPECT_TRUE(status_.succeeded());
 }
 
-TEST_F(tPTPMgmtNodeTest, CopyingProxiesNeedsTheExactCount) {
+TEST_F(tPTPMgmtNodeTest, ADiscoveryWhoseSendFailsPartWayLeavesNothingAwaited) {
     addClock(1);
+    network_.failSends(2, 1);  // domains 0 and 1 go out, domain 2 does not
     node_.findClocks(kDiscoveryMs, status_);
-    iPTPClockProxy* found[2] = {nullptr, nullptr};
-    node_.copyClockProxies(found, 2, status_);
-    EXPECT_EQ(status_.code, kStatusNoData);
-    EXPECT_EQ(found[0], nullptr);
-}
-
-TEST_F(tPTPMgmtNodeTest, FindsAndRemovesClocksByKey) {
-    addClock(1, 2);
-    node_.findClocks(kDiscoveryMs, status_);
-    tClockKey key = {0x00, 0x11, 0x22, 0xFF, 0xFE, 0x33, 0x44, 0x01, 0x00, 0x02};
-    iPTPClockProxy* proxy = node_.findClock(key, status_);
-    ASSERT_NE(proxy, nullptr);
-    EXPECT_EQ(proxy->getPortIdentity(), tPortIdentity(clockIdentity(1), 2));
-    node_.removeClock(proxy, status_);
+    EXPECT_EQ(status_.code, kStatusSocketError);
+    EXPECT_EQ(network_.sentCount(), 2U);
+    // Late answers to the two requests that went out are dropped, not stored for ever.
+    for (std::uint16_t sequenceId = 0; sequenceId < 2; ++sequenceId) {
+        network_.inject(answerOctets(sequenceId, clientPort(), tPortIdentity(clockIdentity(1), 1),
+                                     tManagementMessagePayload::kResponse));
+    }
+    tStatus status;
+    EXPECT_TRUE(exchange(1000, kGet, &status));  // its answer comes after the late ones
+    EXPECT_EQ(node_.getTransceiver().storedResponseCount(), 0U);
+    node_.findClocks(kDiscoveryMs, status);
     EXPECT_EQ(node_.clockCount(), 1);
-    EXPECT_TRUE(status_.succeeded());
-    EXPECT_EQ(node_.findClock(key, status_), nullptr);
-    EXPECT_EQ(status_.code, kStatusNoData);
+    EXPECT_TRUE(status.succeeded());
 }
 
 TEST_F(tPTPMgmtNodeTest, AnExchangeReturnsTheCheckedAnswer) {
     addClock(1).update([](auto& clock) { clock.defaultDataSet.priority1 = 17; });
-    std::unique_ptr<tManagementMessage> answer =
-        exchange(std::make_unique<nQVPTP000::tPriority1TLV>(), kGet, 1000);
+    std::unique_ptr<tManagementMessage> answer = exchange(1000);
     ASSERT_TRUE(answer);
     ASSERT_TRUE(status_.succeeded());
     EXPECT_EQ(answer->getActionField(), tManagementMessagePayload::kResponse);
@@ -181,72 +181,58 @@ TEST_F(tPTPMgmtNodeTest, AnExchangeReturnsTheCheckedAnswer) {
 }
 
 // An error status, an answer of the wrong action and an answer about another management id
-// end the exchange as failed as soon as they arrive, whatever the request's action.
-TEST_F(tPTPMgmtNodeTest, AnswersThatDoNotFitTheRequestFailAsSoonAsTheyArrive) {
+// end the exchange as failed when they arrive: a fitting answer that comes later is not
+// taken.
+TEST_F(tPTPMgmtNodeTest, AnswersThatDoNotFitTheRequestEndTheExchange) {
     SimulatedClock& clock = addClock(1);
+    std::uint16_t sequenceId = 0;
     for (Fault fault : {Fault::errorStatus, Fault::wrongAction, Fault::wrongManagementId}) {
         clock.setFault(fault);
         for (std::uint32_t action : {kGet, kSet, kCommand}) {
+            const auto fitting = action == kCommand ? tManagementMessagePayload::kAcknowledge
+                                                    : tManagementMessagePayload::kResponse;
+            network_.inject(answerOctets(sequenceId++, clientPort(),
+                                         tPortIdentity(clockIdentity(1), 1), fitting),
+                            std::chrono::milliseconds(2000));
             tStatus status;
-            const double took = millisecondsOf([&] {
-                EXPECT_FALSE(node_.sendAndAwait(tPortIdentity(clockIdentity(1), 1),
-                                                std::make_unique<nQVPTP000::tNullManagementTLV>(),
-                                                action, 5000, 0, status));
-            });
+            EXPECT_FALSE(node_.sendAndAwait(tPortIdentity(clockIdentity(1), 1),
+                                            std::make_unique<nQVPTP000::tNullManagementTLV>(),
+                                            action, 5000, 0, status));
             EXPECT_EQ(status.code, kStatusNoData) << "action " << action;
             EXPECT_TRUE(isManagementComponent(status));
-            EXPECT_LT(took, 1000.0);
         }
     }
 }
 
-TEST_F(tPTPMgmtNodeTest, AnExchangeTimesOutAfterItsPollSteps) {
-    addClock(1).setFault(Fault::silent);
-    // 120 ms is three steps of 50 ms: about 150 ms.
-    const double took = millisecondsOf(
-        [&] { EXPECT_FALSE(exchange(std::make_unique<nQVPTP000::tPriority1TLV>(), kGet, 120)); });
-    EXPECT_EQ(status_.code, kStatusNoData);
-    EXPECT_GE(took, 140.0);
-    EXPECT_LT(took, 1000.0);
-}
-
-TEST_F(tPTPMgmtNodeTest, ATimeOutOfZeroSendsButAwaitsNothing) {
-    addClock(1);
-    EXPECT_FALSE(exchange(std::make_unique<nQVPTP000::tPriority1TLV>(), kGet, 0));
-    EXPECT_EQ(status_.code, kStatusNoData);
-    EXPECT_EQ(network_.sentCount(), 1U);
-}
-
-TEST_F(tPTPMgmtNodeTest, UnusableAnswersLeadToATimeOut) {
+TEST_F(tPTPMgmtNodeTest, SilenceAndUnusableAnswersEndInATimeOut) {
     SimulatedClock& clock = addClock(1);
-    for (Fault fault : {Fault::garbage, Fault::wrongTargetPort}) {
+    for (Fault fault : {Fault::silent, Fault::garbage, Fault::wrongTargetPort}) {
         clock.setFault(fault);
         tStatus status;
-        EXPECT_FALSE(node_.sendAndAwait(tPortIdentity(clockIdentity(1), 1),
-                                        std::make_unique<nQVPTP000::tPriority1TLV>(), kGet, 100, 0,
-                                        status));
+        EXPECT_FALSE(exchange(100, kGet, &status));
         EXPECT_EQ(status.code, kStatusNoData);
     }
+    // A time-out of zero sends and awaits nothing.
+    clock.setFault(Fault::none);
+    EXPECT_FALSE(exchange(0));
+    EXPECT_EQ(status_.code, kStatusNoData);
+    EXPECT_EQ(network_.sentCount(), 4U);
 }
 
-TEST_F(tPTPMgmtNodeTest, ALateAnswerWithinTheTimeOutIsTaken) {
-    addClock(1).setDelay(std::chrono::milliseconds(120));
-    const double took = millisecondsOf(
-        [&] { EXPECT_TRUE(exchange(std::make_unique<nQVPTP000::tPriority1TLV>(), kGet, 1000)); });
-    EXPECT_TRUE(status_.succeeded());
-    EXPECT_GE(took, 119.0);
-    EXPECT_LT(took, 900.0);  // woken by the arrival, not by the end of the time-out
-}
-
-TEST_F(tPTPMgmtNodeTest, SecondAnswersToAnExchangeAreNotKept) {
-    addClock(1).setFault(Fault::twice);
+TEST_F(tPTPMgmtNodeTest, LateAndRepeatedAnswersAreTakenOnce) {
+    SimulatedClock& clock = addClock(1);
+    clock.setDelay(std::chrono::milliseconds(120));
+    EXPECT_TRUE(exchange(1000));
+    clock.setDelay(std::chrono::milliseconds(0));
+    clock.setFault(Fault::twice);
     for (int round = 0; round < 10; ++round) {
-        EXPECT_TRUE(exchange(std::make_unique<nQVPTP000::tPriority1TLV>(), kGet, 1000));
+        EXPECT_TRUE(exchange(1000));
     }
     ASSERT_TRUE(eventually([&] { return network_.queuedCount() == 0; }));
-    clocks_.back()->setFault(Fault::none);
-    EXPECT_TRUE(exchange(std::make_unique<nQVPTP000::tPriority1TLV>(), kGet, 1000));
+    clock.setFault(Fault::none);
+    EXPECT_TRUE(exchange(1000));
     EXPECT_EQ(node_.getTransceiver().storedResponseCount(), 0U);
+    EXPECT_TRUE(status_.succeeded());
 }
 
 TEST_F(tPTPMgmtNodeTest, AnErrorStatusAnsweringDiscoveryGivesAProxyWithoutDescription) {
@@ -255,11 +241,8 @@ TEST_F(tPTPMgmtNodeTest, AnErrorStatusAnsweringDiscoveryGivesAProxyWithoutDescri
     const auto found = proxies();
     ASSERT_EQ(found.size(), 1U);
     tPTPClockProxy& proxy = *found[0];
-    EXPECT_FALSE(proxy.isOrdinaryClock());
-    EXPECT_FALSE(proxy.isBoundaryClock());
-    EXPECT_FALSE(proxy.isManagementNode());
-    EXPECT_FALSE(proxy.isP2PTransparentClock());
-    EXPECT_FALSE(proxy.isE2ETransparentClock());
+    EXPECT_FALSE(proxy.isOrdinaryClock() || proxy.isBoundaryClock() || proxy.isManagementNode() ||
+                 proxy.isP2PTransparentClock() || proxy.isE2ETransparentClock());
     EXPECT_EQ(proxy.getPhysicalAddressLength(), 0);
     EXPECT_EQ(proxy.getProtocolAddress(), nQVPTP000::tPortAddress());
     char textBuffer[64] = "untouched";

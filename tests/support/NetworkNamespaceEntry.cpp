@@ -2,7 +2,6 @@
 
 #include <fcntl.h>
 #include <sched.h>
-#include <sys/stat.h>
 #include <unistd.h>
 
 #include <cerrno>
@@ -44,14 +43,6 @@ NetworkNamespaceEntry::~NetworkNamespaceEntry() {
     if (previous_ >= 0) {
         close(previous_);
     }
-}
-
-unsigned long NetworkNamespaceEntry::currentNamespaceId() {
-    struct stat info {};
-    if (stat(kThreadNamespace, &info) != 0) {
-        return 0;
-    }
-    return static_cast<unsigned long>(info.st_ino);
 }
 
 }  // namespace qvtest

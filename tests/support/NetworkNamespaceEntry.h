@@ -27,9 +27,6 @@ class NetworkNamespaceEntry {
     bool entered() const { return entered_; }
     const std::string& failure() const { return failure_; }
 
-    // Identifies the calling thread's network namespace (its inode number), 0 if unknown.
-    static unsigned long currentNamespaceId();
-
   private:
     int previous_ = -1;  // descriptor of the thread's namespace before entry
     bool entered_ = false;

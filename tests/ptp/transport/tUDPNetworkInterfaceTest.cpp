@@ -19,7 +19,6 @@
 
 using nQVPTP000::tProtocolDataUnit;
 using nQVPTP000::tUDPNetworkInterface;
-using Clock = std::chrono::steady_clock;
 
 namespace {
 
@@ -100,32 +99,32 @@ class tUDPNetworkInterfaceTest : public ::testing::Test {
 
 }  // namespace
 
-TEST_F(tUDPNetworkInterfaceTest, GeneralMessageReachesTheGeneralPortOfAnotherInterface) {
-    tPlainSocket generalListener;
-    generalListener.listen(320);
-    // A management message header start: messageType 0xD, versionPTP 2, length 0x0036.
-    const std::vector<std::uint8_t> octets = qvtest::hexOctets("0D | 02 | 00 36");
-    tProtocolDataUnit outgoing(status);
-    outgoing.writeOctets(octets.data(), octets.size(), status);
-    sender.sendGeneralMessage(outgoing, status);
-    ASSERT_EQ(status.code, 0);
-    EXPECT_EQ(generalListener.next(), octets);
-    ASSERT_EQ(receiveInto(unit).code, 0);
-    EXPECT_EQ(contents(unit), octets);
-}
-
-TEST_F(tUDPNetworkInterfaceTest, EventMessageArrivesOnTheEventPort) {
-    tPlainSocket eventListener;
-    eventListener.listen(319);
-    // transportSpecific 1 with messageType 0 (Sync): only the event port makes it count.
-    const std::vector<std::uint8_t> octets = qvtest::hexOctets("10 | 02 | 00 2C");
-    tProtocolDataUnit outgoing(status);
-    outgoing.writeOctets(octets.data(), octets.size(), status);
-    sender.sendEventMessage(outgoing, status);
-    EXPECT_EQ(eventListener.next(), octets);
-    ASSERT_EQ(receiveInto(unit).code, 0);
-    EXPECT_EQ(contents(unit), octets);
-    EXPECT_TRUE(receiver.isCompatibilityMode());
+// Each kind goes to its own port of the group and reaches another interface. A Sync with
+// transportSpecific 1 on the event port turns on compatibility mode.
+TEST_F(tUDPNetworkInterfaceTest, MessagesReachTheirPortOfAnotherInterface) {
+    struct {
+        void (tUDPNetworkInterface::*send)(tProtocolDataUnit&, tStatus&);
+        std::uint16_t port;
+        const char* octets;
+        bool compatible;
+    } const cases[] = {
+        // A management message header start: messageType 0xD, versionPTP 2, length 0x0036.
+        {&tUDPNetworkInterface::sendGeneralMessage, 320, "0D | 02 | 00 36", false},
+        {&tUDPNetworkInterface::sendEventMessage, 319, "10 | 02 | 00 2C", true},
+    };
+    for (const auto& c : cases) {
+        tPlainSocket listener;
+        listener.listen(c.port);
+        const std::vector<std::uint8_t> octets = qvtest::hexOctets(c.octets);
+        tProtocolDataUnit outgoing(status);
+        outgoing.writeOctets(octets.data(), octets.size(), status);
+        (sender.*c.send)(outgoing, status);
+        ASSERT_EQ(status.code, 0);
+        EXPECT_EQ(listener.next(), octets);
+        ASSERT_EQ(receiveInto(unit).code, 0);
+        EXPECT_EQ(contents(unit), octets);
+        EXPECT_EQ(receiver.isCompatibilityMode(), c.compatible);
+    }
 }
 
 TEST_F(tUDPNetworkInterfaceTest, EventPortIsTakenFirstWhenBothAreReady) {
@@ -176,19 +175,15 @@ TEST_F(tUDPNetworkInterfaceTest, CompatibilityModePadsEventMessagesUntilClose) {
     EXPECT_FALSE(receiver.isCompatibilityMode());
 }
 
-TEST_F(tUDPNetworkInterfaceTest, AbortEndsAWaitingReceiveWithinTheWaitStep) {
+// An abort ends a waiting receive, or the next one if none waits, and only that one.
+TEST_F(tUDPNetworkInterfaceTest, AbortEndsOneReceive) {
     auto pending = std::async(std::launch::async, [this] { return receiveInto(unit); });
     std::this_thread::sleep_for(std::chrono::milliseconds(300));
     ASSERT_EQ(pending.wait_for(std::chrono::seconds(0)), std::future_status::timeout)
         << "receive returned without traffic";
-    const Clock::time_point aborted = Clock::now();
     receiver.abortReceive(status);
-    const tStatus result = pending.get();
-    EXPECT_EQ(result.code, kStatusAborted);
-    EXPECT_LT(Clock::now() - aborted, std::chrono::seconds(2));
-}
+    EXPECT_EQ(pending.get().code, kStatusAborted);
 
-TEST_F(tUDPNetworkInterfaceTest, PendingAbortEndsTheNextReceiveOnlyOnce) {
     receiver.abortReceive(status);
     EXPECT_EQ(receiveInto(unit).code, kStatusAborted);
     tPlainSocket peer;
@@ -228,16 +223,12 @@ TEST_F(tUDPNetworkInterfaceTest, FirstEthernetAdapterIsOneOfThePair) {
                 qvtest::hexText(mac->data(), 6) == "02 00 00 00 00 02");
 }
 
-TEST(tUDPNetworkInterfaceUnitTest, PortAddressIsTheGroupOverUdpIpv4) {
+TEST(tUDPNetworkInterfaceUnitTest, PortAddressIsTheGroupAndAClosedInterfaceFailsAtOnce) {
     tUDPNetworkInterface transport;
     const nQVPTP000::tPortAddress address = transport.getPortAddress();
     EXPECT_EQ(address.getNetworkProtocol(), 1);  // UDP/IPv4
     ASSERT_EQ(address.getAddressLength(), 4);
     EXPECT_EQ(qvtest::hexText(address.getAddressField(), 4), "E0 00 01 81");
-}
-
-TEST(tUDPNetworkInterfaceUnitTest, ReceiveOnAClosedInterfaceFailsAtOnce) {
-    tUDPNetworkInterface transport;
     tStatus status;
     tProtocolDataUnit unit(status);
     transport.receive(unit, status);

@@ -1,8 +1,8 @@
 #include "tests/support/ptpmgmt/SimulatedNetwork.h"
 
-#include "tests/support/FailingAllocation.h"
-
 #include <new>
+
+#include "tests/support/FailingAllocation.h"
 
 using nQVPTP000::tProtocolDataUnit;
 
@@ -19,16 +19,15 @@ void SimulatedNetwork::attach(SimulatedClock& clock) {
 }
 
 void SimulatedNetwork::open(tStatus& status) {
-    if (status.failed()) {
-        return;
+    if (status.succeeded()) {
+        abortRequested_.store(false);
+        open_.store(true);
     }
-    abortRequested_.store(false);
-    open_.store(true);
 }
 
 void SimulatedNetwork::close(tStatus&) {
     open_.store(false);
-    arrivals_.wake();
+    wake();
 }
 
 void SimulatedNetwork::sendEventMessage(tProtocolDataUnit& unit, tStatus& status) {
@@ -53,19 +52,21 @@ void SimulatedNetwork::send(tProtocolDataUnit& unit, tStatus& status) {
         std::vector<SimulatedClock*> clocks;
         {
             std::lock_guard<std::mutex> guard(lock_);
-            if (!open_.load() || failNextSend_) {
-                failNextSend_ = false;
+            const bool fails = failingSends_ > 0 && sendsBeforeFailure_ == 0;
+            if (!open_.load() || fails) {
+                failingSends_ -= fails ? 1 : 0;
                 status.set(kStatusSocketError, kComponent, kFile, __LINE__);
                 return;
             }
+            sendsBeforeFailure_ -= sendsBeforeFailure_ > 0 ? 1 : 0;
             sent_.emplace_back(unit.getBuffer(), unit.getBuffer() + unit.getLength());
             clocks = clocks_;
         }
-        const auto sentAt = TimedDatagramQueue::tClock::now();
+        const auto sentAt = tClock::now();
         for (SimulatedClock* clock : clocks) {
             for (SimulatedAnswer& answer :
                  clock->answer(unit.getBuffer(), static_cast<std::size_t>(unit.getLength()))) {
-                arrivals_.push(std::move(answer.octets), sentAt + answer.delay);
+                push(std::move(answer.octets), sentAt + answer.delay);
             }
         }
     } catch (const std::bad_alloc&) {
@@ -79,39 +80,33 @@ void SimulatedNetwork::receive(tProtocolDataUnit& unit, tStatus& status) {
         return;
     }
     std::vector<std::uint8_t> octets;
-    const bool arrived =
-        arrivals_.pop(octets, [this] { return abortRequested_.load() || !open_.load(); });
-    if (!arrived) {
-        if (abortRequested_.exchange(false)) {
-            status.set(kStatusAborted, kComponent, kFile, __LINE__);
-        } else {
-            status.set(kStatusOsObjectError, kComponent, kFile, __LINE__);
-        }
-        return;
-    }
-    if (octets.size() > kMaxDatagram) {
+    if (!pop(octets)) {
+        status.set(abortRequested_.exchange(false) ? kStatusAborted : kStatusOsObjectError,
+                   kComponent, kFile, __LINE__);
+    } else if (octets.size() > kMaxDatagram) {
         status.set(kStatusSocketError, kComponent, kFile, __LINE__);
-        return;
+    } else {
+        unit.writeOctets(octets.data(), octets.size(), status);
     }
-    unit.writeOctets(octets.data(), octets.size(), status);
 }
 
 void SimulatedNetwork::abortReceive(tStatus&) {
     abortRequested_.store(true);
-    arrivals_.wake();
+    wake();
 }
 
 void SimulatedNetwork::inject(std::vector<std::uint8_t> octets, std::chrono::milliseconds delay) {
-    arrivals_.push(std::move(octets), TimedDatagramQueue::tClock::now() + delay);
+    push(std::move(octets), tClock::now() + delay);
 }
 
 void SimulatedNetwork::failNextReceive() {
     inject(std::vector<std::uint8_t>(kMaxDatagram + 1, 0));
 }
 
-void SimulatedNetwork::failNextSend() {
+void SimulatedNetwork::failSends(std::size_t successes, std::size_t count) {
     std::lock_guard<std::mutex> guard(lock_);
-    failNextSend_ = true;
+    sendsBeforeFailure_ = successes;
+    failingSends_ = count;
 }
 
 std::vector<std::vector<std::uint8_t>> SimulatedNetwork::sentDatagrams() const {
@@ -122,6 +117,42 @@ std::vector<std::vector<std::uint8_t>> SimulatedNetwork::sentDatagrams() const {
 std::size_t SimulatedNetwork::sentCount() const {
     std::lock_guard<std::mutex> guard(lock_);
     return sent_.size();
+}
+
+std::size_t SimulatedNetwork::queuedCount() const {
+    std::lock_guard<std::mutex> guard(lock_);
+    return arrivals_.size();
+}
+
+void SimulatedNetwork::push(std::vector<std::uint8_t> octets, tClock::time_point due) {
+    {
+        std::lock_guard<std::mutex> guard(lock_);
+        arrivals_.emplace(due, std::move(octets));  // after others due at the same time
+    }
+    changed_.notify_all();
+}
+
+bool SimulatedNetwork::pop(std::vector<std::uint8_t>& octets) {
+    std::unique_lock<std::mutex> guard(lock_);
+    while (!abortRequested_.load() && open_.load()) {
+        if (arrivals_.empty()) {
+            changed_.wait(guard);
+        } else if (arrivals_.begin()->first > tClock::now()) {
+            changed_.wait_until(guard, arrivals_.begin()->first);
+        } else {
+            octets = std::move(arrivals_.begin()->second);
+            arrivals_.erase(arrivals_.begin());
+            return true;
+        }
+    }
+    return false;
+}
+
+// Taking the lock first: a receive that has just seen the flags unchanged is waiting by
+// the time the notification comes.
+void SimulatedNetwork::wake() {
+    { std::lock_guard<std::mutex> guard(lock_); }
+    changed_.notify_all();
 }
 
 }  // namespace qvtest

@@ -3,13 +3,14 @@
 
 #include <atomic>
 #include <chrono>
+#include <condition_variable>
 #include <cstdint>
+#include <map>
 #include <mutex>
 #include <vector>
 
 #include "ptp/transport/iPTPPortMessaging.h"
 #include "tests/support/ptpmgmt/SimulatedClock.h"
-#include "tests/support/ptpmgmt/TimedDatagramQueue.h"
 
 namespace qvtest {
 
@@ -21,6 +22,7 @@ namespace qvtest {
 // for a datagram longer than 1024 octets, which it consumes.
 class SimulatedNetwork final : public nQVPTP000::iPTPPortMessaging {
   public:
+    using tClock = std::chrono::steady_clock;
     static constexpr std::size_t kMaxDatagram = 1024;
 
     // The clock stays the caller's and must outlive the network's use.
@@ -40,26 +42,34 @@ class SimulatedNetwork final : public nQVPTP000::iPTPPortMessaging {
     // Queues a datagram too long for the transport: the receive that meets it fails with
     // -52003, as the UDP transport's receive does for an oversized datagram.
     void failNextReceive();
-    // The next send fails with -52003 and reaches no clock.
-    void failNextSend();
+    // The next `count` sends fail with -52003 after `successes` more have gone out.
+    void failSends(std::size_t successes = 0, std::size_t count = 1);
+    void failNextSend() { failSends(0, 1); }
 
     // Every datagram sent successfully, in order.
     std::vector<std::vector<std::uint8_t>> sentDatagrams() const;
     std::size_t sentCount() const;
     // Datagrams waiting for receive (delayed answers included).
-    std::size_t queuedCount() const { return arrivals_.size(); }
+    std::size_t queuedCount() const;
     bool isOpen() const { return open_.load(); }
 
   private:
     void send(nQVPTP000::tProtocolDataUnit& unit, tStatus& status);
+    void push(std::vector<std::uint8_t> octets, tClock::time_point due);
+    // Waits until the earliest datagram is due and takes it; false once closed or aborted.
+    bool pop(std::vector<std::uint8_t>& octets);
+    void wake();
 
     mutable std::mutex lock_;
+    std::condition_variable changed_;
     std::vector<SimulatedClock*> clocks_;          // guarded by lock_
     std::vector<std::vector<std::uint8_t>> sent_;  // guarded by lock_
-    bool failNextSend_ = false;                    // guarded by lock_
+    std::size_t sendsBeforeFailure_ = 0;           // guarded by lock_
+    std::size_t failingSends_ = 0;                 // guarded by lock_
+    // Answers by due time, in arrival order among equal times; guarded by lock_.
+    std::multimap<tClock::time_point, std::vector<std::uint8_t>> arrivals_;
     std::atomic<bool> open_{false};
     std::atomic<bool> abortRequested_{false};
-    TimedDatagramQueue arrivals_;
 };
 
 }  // namespace qvtest

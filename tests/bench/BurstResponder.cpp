@@ -1,4 +1,4 @@
-#include "tests/network/BurstResponder.h"
+#include "tests/bench/BurstResponder.h"
 
 #include <arpa/inet.h>
 #include <netinet/in.h>

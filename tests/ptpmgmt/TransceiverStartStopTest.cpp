@@ -1,14 +1,20 @@
 #include <gtest/gtest.h>
+#include <sys/resource.h>
+#include <unistd.h>
 
 #include <atomic>
 #include <chrono>
 #include <condition_variable>
+#include <cstdlib>
+#include <fstream>
 #include <mutex>
 #include <thread>
+#include <vector>
 
 #include "ptp/transport/iPTPPortMessaging.h"
 #include "ptpmgmt/tMgmtMsgTransceiver.h"
 #include "tests/ptpmgmt/ClientTestSupport.h"
+#include "tests/support/ptpmgmt/SimulatedNetwork.h"
 
 using nQVPTP000::tManagementMessagePayload;
 using nQVPTP000::tProtocolDataUnit;
@@ -23,7 +29,7 @@ class HeldSendTransport final : public nQVPTP000::iPTPPortMessaging {
   public:
     void open(tStatus&) override { aborted_ = false; }
     void close(tStatus&) override {
-        closed_ = true;
+        ++closes_;
         if (sending_) {
             closedDuringSend_ = true;
         }
@@ -53,7 +59,7 @@ class HeldSendTransport final : public nQVPTP000::iPTPPortMessaging {
     }
 
     std::atomic<bool> sending_{false};
-    std::atomic<bool> closed_{false};
+    std::atomic<int> closes_{0};
     std::atomic<bool> closedDuringSend_{false};
 
   private:
@@ -63,7 +69,9 @@ class HeldSendTransport final : public nQVPTP000::iPTPPortMessaging {
     bool release_ = false;
 };
 
-TEST(TransceiverShutdownTest, StopClosesTheTransportOnlyAfterASendInProgressHasFinished) {
+// Starts the transceiver, holds a send inside the transport and runs `stoppers` stops at
+// once; the send is released while they wait for it.
+void stopDuringASend(int stoppers) {
     HeldSendTransport transport;
     tStatus status;
     tMgmtMsgTransceiver transceiver(&transport, qvtest::clientIdentity(), qvtest::kClientPort,
@@ -79,19 +87,58 @@ TEST(TransceiverShutdownTest, StopClosesTheTransportOnlyAfterASendInProgressHasF
     while (!transport.sending_) {
         std::this_thread::sleep_for(1ms);
     }
-    std::thread stopper([&] {
-        tStatus stopStatus;
-        transceiver.stop(stopStatus);
-    });
+    std::vector<std::thread> stops;
+    for (int i = 0; i < stoppers; ++i) {
+        stops.emplace_back([&] {
+            tStatus stopStatus;
+            transceiver.stop(stopStatus);
+            EXPECT_TRUE(stopStatus.succeeded());
+        });
+    }
     // Long enough for an unguarded stop to reach close while the send is held.
     std::this_thread::sleep_for(100ms);
-    EXPECT_FALSE(transport.closed_);
+    EXPECT_EQ(transport.closes_, 0);
     transport.releaseSend();
     sender.join();
-    stopper.join();
-    EXPECT_TRUE(transport.closed_);
+    for (std::thread& stop : stops) {
+        stop.join();
+    }
+    EXPECT_EQ(transport.closes_, 1);
     EXPECT_FALSE(transport.closedDuringSend_);
     EXPECT_FALSE(transceiver.isRunning());
 }
+
+TEST(TransceiverShutdownTest, StopClosesTheTransportOnlyAfterASendInProgressHasFinished) {
+    stopDuringASend(1);
+}
+
+TEST(TransceiverShutdownTest, TwoStopsAtOnceCloseTheTransportOnce) {
+    stopDuringASend(2);
+}
+
+// Without room for a thread's stack the receive thread cannot start: start reports it and
+// leaves the transport closed. The address space limit is set in a child process only.
+#if !defined(__SANITIZE_ADDRESS__) && !defined(__SANITIZE_THREAD__)
+bool startFailsWithoutRoomForAThread() {
+    qvtest::SimulatedNetwork network;
+    tStatus status;
+    tMgmtMsgTransceiver transceiver(&network, qvtest::clientIdentity(), qvtest::kClientPort,
+                                    status);
+    long pages = 0;
+    std::ifstream("/proc/self/statm") >> pages;
+    const rlimit tight{static_cast<rlim_t>(pages * sysconf(_SC_PAGESIZE)) + (1U << 20),
+                       RLIM_INFINITY};
+    setrlimit(RLIMIT_AS, &tight);
+    transceiver.start(status);
+    return status.code == kStatusOsObjectError && !network.isOpen() && !transceiver.isRunning();
+}
+
+TEST(TransceiverStartTest, AReceiveThreadThatCannotStartFailsStart) {
+    // A fresh process: one that has run threads keeps their stacks for new ones.
+    GTEST_FLAG_SET(death_test_style, "threadsafe");
+    EXPECT_EXIT(std::_Exit(startFailsWithoutRoomForAThread() ? 0 : 1), ::testing::ExitedWithCode(0),
+                "");
+}
+#endif
 
 }  // namespace
