@@ -5,7 +5,6 @@
 #include <filesystem>
 #include <string>
 #include <thread>
-#include <vector>
 
 #include "platform/CodePage.h"
 #include "platform/LocalDateTime.h"
@@ -20,19 +19,15 @@ TEST(EdgeCases, ThreadsSharingOneNamedMutexAreNeverInsideTogether) {
     qv::dsc::osdep::Mutex mutex("threads-" + std::to_string(getpid()));
     std::atomic<int> inside{0};
     std::atomic<int> overlaps{0};
-    {
-        std::vector<std::jthread> threads;
-        for (int t = 0; t < 4; ++t) {
-            threads.emplace_back([&] {
-                for (int i = 0; i < 500; ++i) {
-                    const qv::dsc::osdep::Mutex::Holder holder(mutex);
-                    overlaps += inside++ != 0 ? 1 : 0;
-                    std::this_thread::yield();
-                    --inside;
-                }
-            });
+    const auto work = [&] {
+        for (int i = 0; i < 1000; ++i) {
+            const qv::dsc::osdep::Mutex::Holder holder(mutex);
+            overlaps += inside++ != 0 ? 1 : 0;
+            std::this_thread::yield();
+            --inside;
         }
-    }
+    };
+    { std::jthread first(work), second(work), third(work); }
     EXPECT_EQ(overlaps.load(), 0);
     std::filesystem::remove(mutex.path());
 }
