@@ -1,0 +1,43 @@
+#include "corbel/CommandContext.h"
+
+namespace corbel {
+
+namespace {
+
+const char* errorKind(ExitCode code) {
+    switch (code) {
+        case ExitCode::kNothingFound:
+            return "not-found";
+        case ExitCode::kRejected:
+            return "rejected";
+        default:
+            return "refused";
+    }
+}
+
+}  // namespace
+
+CommandContext::CommandContext(const Options& options)
+    : output_(options.json), wait_(options.waitMilliseconds), expertPath_(options.expertPath) {}
+
+bool CommandContext::open(bool network, ExitCode& failed) {
+    session_ = std::make_unique<ExpertSession>(expertPath_);
+    if (session_->isReady() && (!network || session_->initialize())) {
+        return true;
+    }
+    output_.error("no-expert", session_->failure());
+    failed = ExitCode::kNoExpert;
+    return false;
+}
+
+ExitCode CommandContext::reportFailure(HRESULT result, const std::string& what) const {
+    const ExitCode code = exitCodeOf(result);
+    std::string message = what;
+    if (code == ExitCode::kFailed) {
+        message += " (" + hresultText(result) + ")";
+    }
+    output_.error(errorKind(code), message, {{"result", hresultText(result)}});
+    return code;
+}
+
+}  // namespace corbel

@@ -1,0 +1,53 @@
+#ifndef QV_CORBEL_COMMANDCONTEXT_H
+#define QV_CORBEL_COMMANDCONTEXT_H
+
+#include <qv1588/corbel.h>
+
+#include <cstdint>
+#include <memory>
+#include <optional>
+#include <string>
+
+#include "corbel/DiscoveryWait.h"
+#include "corbel/ExitCode.h"
+#include "corbel/ExpertSession.h"
+#include "corbel/Output.h"
+
+namespace corbel {
+
+// The options that every command takes.
+struct Options {
+    std::string expertPath;                         // --expert
+    std::optional<std::uint32_t> waitMilliseconds;  // --wait
+    bool json = false;                              // --json
+};
+
+// What one command needs: the output channels, the discovery wait of the run and the
+// loaded expert (created on open, released when the context ends).
+class CommandContext {
+  public:
+    explicit CommandContext(const Options& options);
+
+    const Output& out() const { return output_; }
+    IkxSysExpert2& expert() const { return session_->expert(); }
+
+    // Loads the expert and, for commands that talk to clocks, opens its network side. On
+    // failure it has reported why and `failed` is the exit code.
+    bool open(bool network, ExitCode& failed);
+
+    void announce(const char* purpose) const { wait_.announce(purpose); }
+
+    // Reports a failed item operation with the expert's reason when it gives one; returns
+    // the exit code for it.
+    ExitCode reportFailure(HRESULT result, const std::string& what) const;
+
+  private:
+    Output output_;
+    DiscoveryWait wait_;
+    std::unique_ptr<ExpertSession> session_;
+    std::string expertPath_;
+};
+
+}  // namespace corbel
+
+#endif
