@@ -26,7 +26,7 @@ std::vector<std::string> namesOf(IkxSysEnumStringList& names) {
     while (SUCCEEDED(names.Next(16, batch, &fetched)) && fetched > 0) {
         for (ULONG i = 0; i < fetched; ++i) {
             result.push_back(toUtf8(batch[i] == nullptr ? u"" : batch[i]));
-            SysFreeString(batch[i]);
+            freeString(batch[i]);
         }
         fetched = 0;
     }

@@ -1,5 +1,8 @@
 #include "corbel/WideText.h"
 
+#include <cstdint>
+#include <cstdlib>
+
 namespace corbel {
 
 namespace {
@@ -82,8 +85,14 @@ std::string toUtf8(std::u16string_view text) {
     return narrow;
 }
 
+void freeString(BSTR text) {
+    if (text != nullptr) {
+        std::free(reinterpret_cast<std::uint8_t*>(text) - sizeof(std::uint32_t));
+    }
+}
+
 BSTR* OwnedBstr::out() {
-    SysFreeString(text_);
+    freeString(text_);
     text_ = nullptr;
     return &text_;
 }

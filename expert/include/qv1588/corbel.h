@@ -17,12 +17,9 @@
 // host's wide strings). A BSTR points at the first code unit of a NUL-terminated text whose
 // length in octets is stored in the four octets before it; the expert allocates every BSTR
 // it hands out and the receiver frees it with the expert library's own release
-// (`SysFreeString` on Windows). A null BSTR is an empty text. Elsewhere the block of a BSTR
-// begins at its length prefix and comes from the C library's malloc, so that a host that
-// knows only this header frees it: `SysFreeString` below does that.
+// (`SysFreeString` on Windows). A null BSTR is an empty text.
 
 #include <cstdint>
-#include <cstdlib>
 #include <cstring>
 
 #if defined(_WIN32) && !defined(_WIN64)
@@ -37,15 +34,6 @@ using LONG = std::int32_t;
 using BOOL = std::int32_t;
 using OLECHAR = char16_t;
 using BSTR = OLECHAR*;
-
-#ifndef _WIN32
-// Frees a BSTR that the expert handed out; null is accepted.
-inline void SysFreeString(BSTR text) {
-    if (text != nullptr) {
-        std::free(reinterpret_cast<std::uint8_t*>(text) - sizeof(std::uint32_t));
-    }
-}
-#endif
 
 struct GUID {
     std::uint32_t Data1;
