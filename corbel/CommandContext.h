@@ -30,6 +30,7 @@ class CommandContext {
 
     const Output& out() const { return output_; }
     IkxSysExpert2& expert() const { return session_->expert(); }
+    const std::string& libraryPath() const { return session_->libraryPath(); }
 
     // Loads the expert and, for commands that talk to clocks, opens its network side. On
     // failure it has reported why and `failed` is the exit code.

@@ -43,6 +43,7 @@ ExpertSession::ExpertSession(const std::string& libraryPath) {
 }
 
 void ExpertSession::load(const std::string& path) {
+    path_ = path;
     library_ = dlopen(path.c_str(), RTLD_NOW | RTLD_LOCAL);
     if (library_ == nullptr) {
         failure_ = std::string("cannot load the expert library: ") + dlerror();

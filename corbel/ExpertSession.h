@@ -27,6 +27,8 @@ class ExpertSession {
     bool initialize();
 
     IkxSysExpert2& expert() const { return *expert_; }
+    // The library that was loaded.
+    const std::string& libraryPath() const { return path_; }
 
     // Where the default library is looked for, in order.
     static std::string defaultLibraryPaths();
@@ -34,6 +36,7 @@ class ExpertSession {
   private:
     void load(const std::string& path);
 
+    std::string path_;
     void* library_ = nullptr;
     IkxSysExpert2* expert_ = nullptr;
     bool initialized_ = false;

@@ -77,13 +77,15 @@ ExitCode runInfo(const Options& options) {
         context.out().printJson({{"displayName", display},
                                  {"version", version},
                                  {"shortName", shortName},
-                                 {"identifier", guid}});
+                                 {"identifier", guid},
+                                 {"library", context.libraryPath()}});
     } else {
         Table table;
         table.add({"display name", display});
         table.add({"version", version});
         table.add({"short name", shortName});
         table.add({"identifier", guid});
+        table.add({"library", context.libraryPath()});
         table.print();
     }
     return ExitCode::kSuccess;
