@@ -10,11 +10,14 @@ if(NOT TARGET qv1588)
 endif()
 
 set(QV_CMAKE_PACKAGE_DIR ${CMAKE_INSTALL_LIBDIR}/cmake/qv1588)
-set_target_properties(qv_host_api PROPERTIES EXPORT_NAME host_api)
+# Installed, the header is found under the prefix instead of the source tree.
+set_target_properties(qv_host_api PROPERTIES
+  EXPORT_NAME host_api
+  INTERFACE_INCLUDE_DIRECTORIES
+    "$<BUILD_INTERFACE:${PROJECT_SOURCE_DIR}/expert/include>;$<INSTALL_INTERFACE:${CMAKE_INSTALL_INCLUDEDIR}>")
 target_link_libraries(qv1588 INTERFACE qv_host_api)
 install(TARGETS qv1588 qv_host_api EXPORT qv1588Targets
-        LIBRARY DESTINATION ${CMAKE_INSTALL_LIBDIR}
-        INCLUDES DESTINATION ${CMAKE_INSTALL_INCLUDEDIR})
+        LIBRARY DESTINATION ${CMAKE_INSTALL_LIBDIR})
 install(DIRECTORY ${PROJECT_SOURCE_DIR}/expert/include/qv1588
         DESTINATION ${CMAKE_INSTALL_INCLUDEDIR})
 install(TARGETS corbel RUNTIME DESTINATION ${CMAKE_INSTALL_BINDIR})
@@ -31,6 +34,7 @@ install(FILES ${CMAKE_CURRENT_BINARY_DIR}/qv1588Config.cmake
 # The prefix is found from the .pc file's own folder, so that `cmake --install --prefix`
 # anywhere gives a working file.
 file(RELATIVE_PATH QV_PC_TO_PREFIX /prefix/${CMAKE_INSTALL_LIBDIR}/pkgconfig /prefix)
+string(REGEX REPLACE "/$" "" QV_PC_TO_PREFIX "${QV_PC_TO_PREFIX}")
 configure_file(${PROJECT_SOURCE_DIR}/cmake/qv1588.pc.in ${CMAKE_CURRENT_BINARY_DIR}/qv1588.pc
                @ONLY)
 install(FILES ${CMAKE_CURRENT_BINARY_DIR}/qv1588.pc

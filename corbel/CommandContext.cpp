@@ -30,13 +30,15 @@ bool CommandContext::open(bool network, ExitCode& failed) {
     return false;
 }
 
-ExitCode CommandContext::reportFailure(HRESULT result, const std::string& what) const {
+ExitCode CommandContext::reportFailure(HRESULT result, const std::string& what,
+                                       nlohmann::json details) const {
     const ExitCode code = exitCodeOf(result);
     std::string message = what;
     if (code == ExitCode::kFailed) {
         message += " (" + hresultText(result) + ")";
     }
-    output_.error(errorKind(code), message, {{"result", hresultText(result)}});
+    details["result"] = hresultText(result);
+    output_.error(errorKind(code), message, details);
     return code;
 }
 

@@ -38,9 +38,9 @@ class CommandContext {
 
     void announce(const char* purpose) const { wait_.announce(purpose); }
 
-    // Reports a failed item operation with the expert's reason when it gives one; returns
-    // the exit code for it.
-    ExitCode reportFailure(HRESULT result, const std::string& what) const;
+    // Reports a failed item operation (with `details` in JSON); returns its exit code.
+    ExitCode reportFailure(HRESULT result, const std::string& what,
+                           nlohmann::json details = nlohmann::json::object()) const;
 
   private:
     Output output_;

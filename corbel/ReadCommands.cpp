@@ -26,7 +26,7 @@ std::vector<std::string> namesOf(IkxSysEnumStringList& names) {
     while (SUCCEEDED(names.Next(16, batch, &fetched)) && fetched > 0) {
         for (ULONG i = 0; i < fetched; ++i) {
             result.push_back(toUtf8(batch[i] == nullptr ? u"" : batch[i]));
-            freeString(batch[i]);
+            SysFreeString(batch[i]);
         }
         fetched = 0;
     }
@@ -126,11 +126,10 @@ ExitCode runItems(const Options& options) {
     if (result != S_OK || collector.items().empty()) {
         return context.reportFailure(result == S_OK ? S_FALSE : result, kNothingFound);
     }
-    constexpr kxSysAttributeTagID kItemName = 0x101D000;
     if (context.out().json()) {
         nlohmann::json document = nlohmann::json::object();
         for (const PropertyValues& item : collector.items()) {
-            document[textOf(item, kItemName)] = itemJson(item);
+            document[textOf(item, kxSysItemName)] = itemJson(item);
         }
         context.out().printJson(document);
         return ExitCode::kSuccess;
@@ -139,8 +138,9 @@ ExitCode runItems(const Options& options) {
     table.add(
         {"ITEM", "PROTOCOL ADDRESS", "PHYSICAL ADDRESS", "PRODUCT", "USER DESCRIPTION", "PROFILE"});
     for (const PropertyValues& item : collector.items()) {
-        table.add({textOf(item, kItemName), textOf(item, 0x102C000), textOf(item, 0x1033000),
-                   textOf(item, 0xE002000), textOf(item, 0xE003000), textOf(item, 0xE004000)});
+        table.add({textOf(item, kxSysItemName), textOf(item, kxSysNetworkAddress),
+                   textOf(item, kxSysHardwareAddress), textOf(item, kxQvProductDescription),
+                   textOf(item, kxQvUserDescription), textOf(item, kxQvProfileIdentity)});
     }
     table.print();
     return ExitCode::kSuccess;

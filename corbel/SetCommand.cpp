@@ -94,7 +94,8 @@ ExitCode runSet(const Options& options, const std::string& item,
     const HRESULT valid =
         expert.ValidateChanges(name.c_str(), bag.get(), accepted.out(), message.out());
     if (valid == CORBEL_E_INVALID_VALUE) {
-        return context.reportFailure(valid, "rejected: " + sentencesOf(message.utf8()));
+        return context.reportFailure(valid, "rejected: " + sentencesOf(message.utf8()),
+                                     {{"item", item}, {"sentences", message.utf8()}});
     }
     if (FAILED(valid)) {
         return context.reportFailure(valid, "the changes cannot be validated");
@@ -103,9 +104,11 @@ ExitCode runSet(const Options& options, const std::string& item,
     const HRESULT applied = expert.ApplyChanges(name.c_str(), bag.get(), &ignored);
     if (FAILED(applied)) {
         return context.reportFailure(
-            applied, item +
-                         ": the clock did not take the change (values before it in tag "
-                         "order may have been written)");
+            applied,
+            item +
+                ": the clock refused the change or did not answer (changes before it in tag "
+                "order may have been written)",
+            {{"item", item}});
     }
     for (const Change& change : changes) {
         std::printf("%s: %s = %s\n", item.c_str(), change.info->name, toText(change.value).c_str());

@@ -96,7 +96,11 @@ ExitCode runShow(const Options& options, const std::string& item,
             }
         }
         if (FAILED(result)) {
-            context.reportFailure(result, item + ": the clock did not serve the " + group.name);
+            context.reportFailure(result,
+                                  item + ": no " + group.name +
+                                      " (the clock refused the request "
+                                      "or did not answer)",
+                                  {{"item", item}, {"group", group.name}});
             refusals.push_back({&group, tags});
         }
     }

@@ -9,18 +9,13 @@
 
 namespace corbel {
 
-// What the command line knows of an attribute tag.
-struct TagInfo {
-    const char* name;  // symbolic name, e.g. "priority1"
-    kxSysAttributeTagID tag;
-    kxSysPropertyType type;
-    bool settable;
-};
+// What the command line knows of a tag is the expert's vocabulary in the public header.
+using TagInfo = kxQvAttribute;
 
-// Every tag the expert shows, in ascending tag order.
 std::span<const TagInfo> allTags();
 
-// By symbolic name or by number ("0xE006000", any case, or decimal); null when unknown.
+// By symbolic name (any case) or by number ("0xE006000", any case, or decimal); null when
+// the expert does not know it.
 const TagInfo* findTag(std::string_view nameOrNumber);
 const TagInfo* findTag(kxSysAttributeTagID tag);
 

@@ -1,8 +1,5 @@
 #include "corbel/WideText.h"
 
-#include <cstdint>
-#include <cstdlib>
-
 namespace corbel {
 
 namespace {
@@ -85,14 +82,8 @@ std::string toUtf8(std::u16string_view text) {
     return narrow;
 }
 
-void freeString(BSTR text) {
-    if (text != nullptr) {
-        std::free(reinterpret_cast<std::uint8_t*>(text) - sizeof(std::uint32_t));
-    }
-}
-
 BSTR* OwnedBstr::out() {
-    freeString(text_);
+    SysFreeString(text_);
     text_ = nullptr;
     return &text_;
 }

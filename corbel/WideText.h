@@ -13,15 +13,11 @@ namespace corbel {
 std::u16string toUtf16(std::string_view text);
 std::string toUtf8(std::u16string_view text);
 
-// Frees a BSTR that the expert handed out: its block begins at the four-octet length prefix
-// and comes from the C library's malloc, which the program and the library share.
-void freeString(BSTR text);
-
-// Owns a BSTR that the expert handed out.
+// Owns a BSTR that the expert handed out and frees it with SysFreeString.
 class OwnedBstr {
   public:
     OwnedBstr() = default;
-    ~OwnedBstr() { freeString(text_); }
+    ~OwnedBstr() { SysFreeString(text_); }
     OwnedBstr(const OwnedBstr&) = delete;
     OwnedBstr& operator=(const OwnedBstr&) = delete;
 
