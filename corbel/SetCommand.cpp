@@ -44,13 +44,15 @@ std::optional<Change> parseChange(const std::string& assignment, const Output& o
     return Change{info, std::move(*value)};
 }
 
-// The expert's sentences end with two spaces each; one per line reads better here.
+// The expert's sentences end with two spaces each; here each stands on a line of its own.
 std::string sentencesOf(const std::string& message) {
-    std::string lines = message;
-    for (std::size_t at = 0; (at = lines.find(".  ", at)) != std::string::npos;) {
-        lines.replace(at, 3, at + 3 < lines.size() ? ".\n" : ".");
+    std::string lines;
+    std::size_t start = 0;
+    for (std::size_t end = 0; (end = message.find(".  ", start)) != std::string::npos;
+         start = end + 3) {
+        lines += "\n  " + message.substr(start, end + 1 - start);
     }
-    return lines;
+    return start < message.size() ? lines + "\n  " + message.substr(start) : lines;
 }
 
 }  // namespace
@@ -94,7 +96,7 @@ ExitCode runSet(const Options& options, const std::string& item,
     const HRESULT valid =
         expert.ValidateChanges(name.c_str(), bag.get(), accepted.out(), message.out());
     if (valid == CORBEL_E_INVALID_VALUE) {
-        return context.reportFailure(valid, "rejected: " + sentencesOf(message.utf8()),
+        return context.reportFailure(valid, "rejected by validation:" + sentencesOf(message.utf8()),
                                      {{"item", item}, {"sentences", message.utf8()}});
     }
     if (FAILED(valid)) {

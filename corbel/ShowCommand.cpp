@@ -1,5 +1,6 @@
 #include <algorithm>
 #include <cstdio>
+#include <map>
 
 #include "corbel/ComPtr.h"
 #include "corbel/Commands.h"
@@ -31,25 +32,28 @@ std::vector<kxSysAttributeTagID> tagsToRead(const ReadGroup& group,
     return tags;
 }
 
+// One row per tag in tag order; the tags of a refused group say so.
 void printTable(const std::string& item, const PropertyValues& values,
                 const std::vector<Refusal>& refusals) {
-    std::printf("%s\n", item.c_str());
-    Table table;
-    table.add({" ", "NAME", "TAG", "TYPE", "VALUE"});
-    auto add = [&table](kxSysAttributeTagID tag, const char* type, const std::string& value) {
-        const TagInfo* info = findTag(tag);
-        table.add({info != nullptr && info->settable ? "*" : " ",
-                   info != nullptr ? info->name : "?", tagText(tag), type, value});
-    };
+    std::map<kxSysAttributeTagID, std::pair<ULONG, std::string>> rows;
     for (const auto& [tag, value] : values) {
-        add(tag, typeName(static_cast<ULONG>(value.index() + 1)), toText(value));
+        rows[tag] = {static_cast<ULONG>(value.index() + 1), toText(value)};
     }
     for (const Refusal& refusal : refusals) {
         for (const kxSysAttributeTagID tag : refusal.tags) {
             const TagInfo* info = findTag(tag);
-            add(tag, info != nullptr ? typeName(info->type) : "?", "(refused)");
+            rows[tag] = {info != nullptr ? info->type : 0u, "(refused)"};
         }
     }
+    Table table;
+    table.add({" ", "NAME", "TAG", "TYPE", "VALUE"});
+    for (const auto& [tag, row] : rows) {
+        const TagInfo* info = findTag(tag);
+        table.add({info != nullptr && info->settable ? "*" : " ",
+                   info != nullptr ? info->name : "?", tagText(tag), typeName(row.first),
+                   row.second});
+    }
+    std::printf("%s\n", item.c_str());
     table.print("  ");
     std::printf("  (* settable with corbel set)\n");
 }

@@ -97,7 +97,7 @@ TEST_F(Corbel, EndsWithTheDocumentedCodeAndSaysWhyOnStandardError) {
     } cases[] = {
         {"set " + kPtpd + " priority1=300 domainNumber=7", 3,
          "Domain must be an integer within the range 0 (PTP default domain) to 3.\n"
-         "Priority values must be integers within the range 0-255."},
+         "  Priority values must be integers within the range 0-255."},
         {"set " + kPtp4l + " priority1=50", 4, "the clock refused the change or did not answer"},
         {"show 02-11-22-FF-FE-00-00-01:1", 1, "no clock answers to the item name"},
         {"show " + kPtpd + " priority7", 2, "unknown tag 'priority7'"},
