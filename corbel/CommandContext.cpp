@@ -1,5 +1,7 @@
 #include "corbel/CommandContext.h"
 
+#include "corbel/WideText.h"
+
 namespace corbel {
 
 namespace {
@@ -28,6 +30,20 @@ bool CommandContext::open(bool network, ExitCode& failed) {
     output_.error("no-expert", session_->failure());
     failed = ExitCode::kNoExpert;
     return false;
+}
+
+ComPtr<IkxSysPropertyBag> CommandContext::getItem(const std::string& item, ExitCode& failed) const {
+    ComPtr<IkxSysPropertyBag> bag;
+    const HRESULT result = expert().GetItem(toUtf16(item).c_str(), bag.out());
+    if (SUCCEEDED(result) && bag) {
+        return bag;
+    }
+    failed = reportFailure(FAILED(result) ? result : E_POINTER,
+                           result == CORBEL_E_ITEM_NOT_FOUND
+                               ? "no clock answers to the item name " + item
+                               : "cannot look up " + item + " (discovery failed)",
+                           {{"item", item}});
+    return {};
 }
 
 ExitCode CommandContext::reportFailure(HRESULT result, const std::string& what,

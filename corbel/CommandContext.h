@@ -8,6 +8,7 @@
 #include <optional>
 #include <string>
 
+#include "corbel/ComPtr.h"
 #include "corbel/DiscoveryWait.h"
 #include "corbel/ExitCode.h"
 #include "corbel/ExpertSession.h"
@@ -37,6 +38,10 @@ class CommandContext {
     bool open(bool network, ExitCode& failed);
 
     void announce(const char* purpose) const { wait_.announce(purpose); }
+
+    // The item's base bag through GetItem, which runs a discovery for a name it does not
+    // know; empty when there is none, with the reason reported and its exit code in `failed`.
+    ComPtr<IkxSysPropertyBag> getItem(const std::string& item, ExitCode& failed) const;
 
     // Reports a failed item operation (with `details` in JSON); returns its exit code.
     ExitCode reportFailure(HRESULT result, const std::string& what,

@@ -55,6 +55,34 @@ std::string sentencesOf(const std::string& message) {
     return start < message.size() ? lines + "\n  " + message.substr(start) : lines;
 }
 
+// The expert checks the changed tags of `bag`, then writes them to the clock.
+ExitCode validateAndApply(const CommandContext& context, const std::string& item,
+                          IkxSysPropertyBag2& bag) {
+    const std::u16string name = toUtf16(item);
+    ComPtr<IkxSysEnumPropertyTag> accepted;
+    OwnedBstr message;
+    const HRESULT valid =
+        context.expert().ValidateChanges(name.c_str(), &bag, accepted.out(), message.out());
+    if (valid == CORBEL_E_INVALID_VALUE) {
+        return context.reportFailure(valid, "rejected by validation:" + sentencesOf(message.utf8()),
+                                     {{"item", item}, {"sentences", message.utf8()}});
+    }
+    if (FAILED(valid)) {
+        return context.reportFailure(valid, "the changes cannot be validated");
+    }
+    ULONG ignored = 0;
+    const HRESULT applied = context.expert().ApplyChanges(name.c_str(), &bag, &ignored);
+    if (FAILED(applied)) {
+        return context.reportFailure(
+            applied,
+            item +
+                ": the clock refused the change or did not answer (changes before it in tag "
+                "order may have been written)",
+            {{"item", item}});
+    }
+    return ExitCode::kSuccess;
+}
+
 }  // namespace
 
 ExitCode runSet(const Options& options, const std::string& item,
@@ -74,12 +102,9 @@ ExitCode runSet(const Options& options, const std::string& item,
         return failed;
     }
     context.announce(("set " + item).c_str());
-    IkxSysExpert2& expert = context.expert();
-    const std::u16string name = toUtf16(item);
-    ComPtr<IkxSysPropertyBag> base;
-    const HRESULT found = expert.GetItem(name.c_str(), base.out());
-    if (FAILED(found) || !base) {
-        return context.reportFailure(found, "no clock answers to the item name " + item);
+    const auto base = context.getItem(item, failed);
+    if (!base) {
+        return failed;
     }
     const auto bag = base.query<IkxSysPropertyBag2>(IID_IkxSysPropertyBag2);
     if (!bag || FAILED(bag->ClearChangedTags())) {
@@ -91,26 +116,9 @@ ExitCode runSet(const Options& options, const std::string& item,
             return context.reportFailure(stored, std::string("cannot store ") + change.info->name);
         }
     }
-    ComPtr<IkxSysEnumPropertyTag> accepted;
-    OwnedBstr message;
-    const HRESULT valid =
-        expert.ValidateChanges(name.c_str(), bag.get(), accepted.out(), message.out());
-    if (valid == CORBEL_E_INVALID_VALUE) {
-        return context.reportFailure(valid, "rejected by validation:" + sentencesOf(message.utf8()),
-                                     {{"item", item}, {"sentences", message.utf8()}});
-    }
-    if (FAILED(valid)) {
-        return context.reportFailure(valid, "the changes cannot be validated");
-    }
-    ULONG ignored = 0;
-    const HRESULT applied = expert.ApplyChanges(name.c_str(), bag.get(), &ignored);
-    if (FAILED(applied)) {
-        return context.reportFailure(
-            applied,
-            item +
-                ": the clock refused the change or did not answer (changes before it in tag "
-                "order may have been written)",
-            {{"item", item}});
+    const ExitCode written = validateAndApply(context, item, *bag);
+    if (written != ExitCode::kSuccess) {
+        return written;
     }
     for (const Change& change : changes) {
         std::printf("%s: %s = %s\n", item.c_str(), change.info->name, toText(change.value).c_str());

@@ -58,33 +58,12 @@ void printTable(const std::string& item, const PropertyValues& values,
     std::printf("  (* settable with corbel set)\n");
 }
 
-}  // namespace
-
-ExitCode runShow(const Options& options, const std::string& item,
-                 const std::vector<std::string>& tagNames) {
-    const Output output(options.json);
-    std::vector<kxSysAttributeTagID> wanted;
-    for (const std::string& name : tagNames) {
-        const TagInfo* info = findTag(name);
-        if (info == nullptr) {
-            output.error("usage", "unknown tag '" + name + "' (corbel tags lists them)");
-            return ExitCode::kBadUsage;
-        }
-        wanted.push_back(info->tag);
-    }
-    CommandContext context(options);
-    ExitCode failed = ExitCode::kSuccess;
-    if (!context.open(true, failed)) {
-        return failed;
-    }
-    context.announce(("show " + item).c_str());
+// Reads the groups of `wanted` (every group when it is empty) into `values`, one request
+// each; the groups that fail are returned.
+std::vector<Refusal> readFromClock(const CommandContext& context, const std::string& item,
+                                   const std::vector<kxSysAttributeTagID>& wanted,
+                                   PropertyValues& values) {
     const std::u16string name = toUtf16(item);
-    ComPtr<IkxSysPropertyBag> base;
-    const HRESULT found = context.expert().GetItem(name.c_str(), base.out());
-    if (FAILED(found) || !base) {
-        return context.reportFailure(found, "no clock answers to the item name " + item);
-    }
-    PropertyValues values = readBag(*base);
     std::vector<Refusal> refusals;
     for (const ReadGroup& group : readGroups()) {
         const auto tags = tagsToRead(group, wanted);
@@ -108,6 +87,35 @@ ExitCode runShow(const Options& options, const std::string& item,
             refusals.push_back({&group, tags});
         }
     }
+    return refusals;
+}
+
+}  // namespace
+
+ExitCode runShow(const Options& options, const std::string& item,
+                 const std::vector<std::string>& tagNames) {
+    const Output output(options.json);
+    std::vector<kxSysAttributeTagID> wanted;
+    for (const std::string& name : tagNames) {
+        const TagInfo* info = findTag(name);
+        if (info == nullptr) {
+            output.error("usage", "unknown tag '" + name + "' (corbel tags lists them)");
+            return ExitCode::kBadUsage;
+        }
+        wanted.push_back(info->tag);
+    }
+    CommandContext context(options);
+    ExitCode failed = ExitCode::kSuccess;
+    if (!context.open(true, failed)) {
+        return failed;
+    }
+    context.announce(("show " + item).c_str());
+    const auto base = context.getItem(item, failed);
+    if (!base) {
+        return failed;
+    }
+    PropertyValues values = readBag(*base);
+    const auto refusals = readFromClock(context, item, wanted, values);
     if (!wanted.empty()) {
         std::erase_if(values, [&wanted](const auto& entry) {
             return std::ranges::find(wanted, entry.first) == wanted.end();
