@@ -41,6 +41,23 @@ class CQVComObject final : public Base {
         return S_OK;
     }
 
+    // Creates the object and hands it out as its interface I with one reference for the
+    // caller; on failure `*object` is null and the code is CreateInstance's.
+    template <class I>
+    static HRESULT CreateReferenced(I** object) noexcept {
+        if (object == nullptr) {
+            return E_POINTER;
+        }
+        *object = nullptr;
+        CQVComObject* created = nullptr;
+        const HRESULT result = CreateInstance(&created);
+        if (SUCCEEDED(result)) {
+            created->AddRef();
+            *object = created;
+        }
+        return result;
+    }
+
     HRESULT KXSYS_CALL QueryInterface(const IID& iid, void** out) override {
         const HRESULT result = CQVComObjectRootBase::InternalQueryInterface(
             static_cast<Base*>(this), Base::InterfaceTable(), iid, out);

@@ -9,6 +9,7 @@
 #include "expert/CkxDateTimeFields.h"
 #include "expert/CkxSysEnumPropertyTagsSTL.h"
 #include "expert/CkxTemplatePropertyValue.h"
+#include "expert/QVCreateEnumerator.h"
 #include "expert/QVGuardedSlot.h"
 
 namespace {
@@ -76,28 +77,6 @@ HRESULT CkxDynamicPropertyBag::getCopy(kxSysAttributeTagID tag, T* value) const 
     return result;
 }
 
-template <class Container>
-HRESULT CkxDynamicPropertyBag::enumerate(const Container& tags,
-                                         IkxSysEnumPropertyTag** enumerator) {
-    if (enumerator == nullptr) {
-        return E_POINTER;
-    }
-    *enumerator = nullptr;
-    if (tags.empty()) {
-        return S_FALSE;
-    }
-    using Enumerator = CQVComObject<CkxSysEnumPropertyTagsSTL<Container>>;
-    Enumerator* created = nullptr;
-    const HRESULT creation = Enumerator::CreateInstance(&created);
-    if (FAILED(creation)) {
-        return creation;
-    }
-    CQVComPtr<Enumerator> held(created);
-    created->Init(static_cast<IkxSysPropertyBag2*>(this), &tags);
-    *enumerator = held.Detach();
-    return S_OK;
-}
-
 template <class T>
 HRESULT CkxDynamicPropertyBag::copyValue(CkxDynamicPropertyBag& to, kxSysAttributeTagID tag,
                                          const CkxPropertyValue& from) {
@@ -116,7 +95,11 @@ std::span<const CkxDynamicPropertyBag::Copier> CkxDynamicPropertyBag::copiers() 
 }
 
 HRESULT CkxDynamicPropertyBag::EnumerateTags(IkxSysEnumPropertyTag** tags) {
-    return QVGuardedSlot([&] { return enumerate(values_, tags); });
+    if (tags != nullptr && values_.empty()) {
+        *tags = nullptr;
+        return S_FALSE;
+    }
+    return QVCreateEnumerator<CkxSysEnumPropertyTagsSTL<ValueMap>>(this, values_, tags);
 }
 
 HRESULT CkxDynamicPropertyBag::HasTag(kxSysAttributeTagID tag) {
@@ -283,7 +266,11 @@ HRESULT CkxDynamicPropertyBag::ClearChangedTags() {
 }
 
 HRESULT CkxDynamicPropertyBag::EnumerateChangedTags(IkxSysEnumPropertyTag** tags) {
-    return QVGuardedSlot([&] { return enumerate(changed_, tags); });
+    if (tags != nullptr && changed_.empty()) {
+        *tags = nullptr;
+        return S_FALSE;
+    }
+    return QVCreateEnumerator<CkxSysEnumPropertyTagsSTL<TagSet>>(this, changed_, tags);
 }
 
 HRESULT CkxDynamicPropertyBag::GetTimestamp(kxSysAttributeTagID tag, Timestamp* value) {

@@ -75,8 +75,6 @@ class CkxDynamicPropertyBag : public IkxSysPropertyBag2,
     HRESULT lookup(kxSysAttributeTagID tag, const T** value) const;
     template <class T>
     HRESULT getCopy(kxSysAttributeTagID tag, T* value) const;
-    template <class Container>
-    HRESULT enumerate(const Container& tags, IkxSysEnumPropertyTag** enumerator);
     template <class T>
     static HRESULT copyValue(CkxDynamicPropertyBag& to, kxSysAttributeTagID tag,
                              const CkxPropertyValue& from);

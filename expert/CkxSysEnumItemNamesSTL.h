@@ -24,7 +24,9 @@ class CkxSysEnumItemNamesSTL
     }
 
     // Takes the list over and stands on its first name.
-    void Adopt(std::unique_ptr<const NameList> names) { IQVEnumOnSTLImpl::Adopt(std::move(names)); }
+    void Adopt(std::unique_ptr<const NameList> names) noexcept {
+        IQVEnumOnSTLImpl::Adopt(std::move(names));
+    }
 
   protected:
     CkxSysEnumItemNamesSTL() = default;

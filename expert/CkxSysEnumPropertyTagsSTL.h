@@ -27,7 +27,7 @@ class CkxSysEnumPropertyTagsSTL
     }
 
     // Takes the container over and stands on its first tag.
-    void Adopt(std::unique_ptr<const Container> tags) { Impl::Adopt(std::move(tags)); }
+    void Adopt(std::unique_ptr<const Container> tags) noexcept { Impl::Adopt(std::move(tags)); }
 
   protected:
     CkxSysEnumPropertyTagsSTL() = default;

@@ -19,7 +19,7 @@ class IQVEnumOnSTLImpl : public Base {
     using ContainerType = Container;
 
     // Walks `container`, which `owner` keeps alive (the enumerator takes a reference to it).
-    void Init(IUnknown* owner, const Container* container) {
+    void Init(IUnknown* owner, const Container* container) noexcept {
         owner_ = CQVComPtr<IUnknown>(owner);
         container_ = container;
         cursor_.reset(*container_);
@@ -67,7 +67,7 @@ class IQVEnumOnSTLImpl : public Base {
     virtual ~IQVEnumOnSTLImpl() = default;
 
     // Makes the enumerator the owner of `container` (it has no owner reference then).
-    void Adopt(std::unique_ptr<const Container> container) {
+    void Adopt(std::unique_ptr<const Container> container) noexcept {
         ownedContainer_ = std::move(container);
         Init(nullptr, ownedContainer_.get());
     }

@@ -143,32 +143,29 @@ std::unique_ptr<tManagementMessage> tMgmtMsgTransceiver::takeResponse(std::uint1
 }
 
 void tMgmtMsgTransceiver::cancelRequest(std::uint16_t sequenceId, tStatus& status) {
-    if (status.failed()) {
-        return;
-    }
-    nQVTARN000::tMutex::tGuard guard(pendingLock_, status);
-    if (status.succeeded()) {
-        auto found = std::find(pendingSequenceIds_.begin(), pendingSequenceIds_.end(), sequenceId);
-        if (found != pendingSequenceIds_.end()) {
-            pendingSequenceIds_.erase(found);
-        }
-    }
+    forget(sequenceId, false, status);
 }
 
 void tMgmtMsgTransceiver::retireRequest(std::uint16_t sequenceId, tStatus& status) {
+    forget(sequenceId, true, status);
+}
+
+void tMgmtMsgTransceiver::forget(std::uint16_t sequenceId, bool storedToo, tStatus& status) {
     if (status.failed()) {
         return;
     }
     // Under pendingLock_ the receive thread cannot be between matching an answer to this id
     // and storing it, so nothing for it can be stored after this.
     nQVTARN000::tMutex::tGuard pending(pendingLock_, status);
-    auto found = std::find(pendingSequenceIds_.begin(), pendingSequenceIds_.end(), sequenceId);
-    if (found != pendingSequenceIds_.end()) {
-        pendingSequenceIds_.erase(found);
+    if (status.failed()) {
+        return;
     }
-    nQVTARN000::tMutex::tGuard responses(responsesLock_, status);
-    if (status.succeeded()) {
-        responses_.erase(sequenceId);
+    std::erase(pendingSequenceIds_, sequenceId);
+    if (storedToo) {
+        nQVTARN000::tMutex::tGuard responses(responsesLock_, status);
+        if (status.succeeded()) {
+            responses_.erase(sequenceId);
+        }
     }
 }
 

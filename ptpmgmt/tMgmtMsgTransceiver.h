@@ -74,6 +74,8 @@ class tMgmtMsgTransceiver final : public nQVTARN000::iThread {
     bool matches(const nQVPTP000::tPTPMessage& message, tStatus& status) const;
     void store(std::unique_ptr<nQVPTP000::tManagementMessage> message, tStatus& status);
     void noteReceiveError(tStatus& threadStatus);
+    // Drops the id from the awaited ones and, when `storedToo`, its stored answers.
+    void forget(std::uint16_t sequenceId, bool storedToo, tStatus& status);
 
     std::uint32_t nextSequenceId_ = 0;         // guarded by sendLock_
     nQVPTP000::iPTPPortMessaging* transport_;  // not owned

@@ -157,20 +157,21 @@ iPTPClockProxy* tPTPMgmtNode::findClock(const tClockKey& key, tStatus& status) {
     return status.succeeded() ? found->second.get() : nullptr;
 }
 
+// By identity, not by the proxy's key: after assign that key names another port, whose
+// proxy must stay.
 void tPTPMgmtNode::removeClock(iPTPClockProxy* proxy, tStatus& status) {
     if (status.failed() || proxy == nullptr) {
         return;
     }
     tMutex::tGuard guard(clockListLock_, status);
-    tClockKey key{};
-    std::copy_n(proxy->getClockKey(), key.size(), key.begin());
-    auto found = clocks_.find(key);
+    auto found = std::find_if(clocks_.begin(), clocks_.end(),
+                              [proxy](const auto& entry) { return entry.second.get() == proxy; });
     if (status.succeeded() && found == clocks_.end()) {
         QV_STATUS_SET(status, kStatusNoData, kComponentMgmt);
     }
     if (status.succeeded()) {
+        descriptions_.erase(found->first);
         clocks_.erase(found);
-        descriptions_.erase(key);
         clockCount_.store(static_cast<std::uint16_t>(clocks_.size()));
     }
 }

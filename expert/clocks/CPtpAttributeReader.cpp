@@ -5,13 +5,13 @@
 #include <cstring>
 
 #include "expert/clocks/CPtpValueFormat.h"
+#include "ptp/TLVs/tClockDescriptionTLV.h"
 #include "ptp/TLVs/tCurrentDataSetTLV.h"
 #include "ptp/TLVs/tDefaultDataSetTLV.h"
 #include "ptp/TLVs/tParentDataSetTLV.h"
 #include "ptp/TLVs/tPortDataSetTLV.h"
 #include "ptp/TLVs/tTimePropertiesDataSetTLV.h"
 #include "ptp/TLVs/tUTCPropertiesTLV.h"
-#include "ptpmgmt/tPTPClockProxy.h"
 
 namespace {
 
@@ -21,11 +21,6 @@ using F = CPtpValueFormat;
 constexpr std::uint8_t kPortDisabled = 3;
 constexpr std::uint16_t kTextBuffer = 256;
 constexpr std::uint8_t kOwnManufacturer[3] = {0x02, 0xA5, 0x3C};
-
-// The clock description as the proxy keeps it beyond what every proxy offers.
-nQVPTPMGMT000::tPTPClockProxy& describing(iPTPClockProxy& proxy) {
-    return static_cast<nQVPTPMGMT000::tPTPClockProxy&>(proxy);
-}
 
 void readTime(iPTPClockProxy& proxy, CPtpBagFiller& bag, tStatus& status) {
     const nQVPTP000::tTimestamp time = proxy.getTime(status);
@@ -137,12 +132,12 @@ std::u16string networkAddressOf(const nQVPTP000::tPortAddress& address) {
 void CPtpAttributeReader::readDescription(iPTPClockProxy& proxy, bool refresh, CPtpBagFiller& bag,
                                           tStatus& status) {
     if (refresh) {
-        describing(proxy).refreshClockDescription(status);
+        proxy.refreshClockDescription(status);
     }
     if (status.failed()) {
         return;
     }
-    bag.setString(kxSysNetworkAddress, networkAddressOf(describing(proxy).getProtocolAddress()));
+    bag.setString(kxSysNetworkAddress, networkAddressOf(proxy.getProtocolAddress()));
     std::array<std::uint8_t, kTextBuffer> octets{};
     const std::uint16_t length = std::min(proxy.getPhysicalAddressLength(), kTextBuffer);
     proxy.getPhysicalAddress(octets.data(), kTextBuffer, status);

@@ -10,19 +10,11 @@
 
 namespace qvtest {
 
-namespace {}  // namespace
-
-nQVPTP000::tClockIdentity ExpertFixture::identity(std::uint8_t last) {
-    const std::uint8_t octets[8] = {0x02, 0x11, 0x22, 0xFF, 0xFE, 0x33, 0x44, last};
-    return nQVPTP000::tClockIdentity(octets);
-}
-
 void ExpertFixture::SetUpTestSuite() {
-    // A settings root and a lock folder of the test's own: discovery waits 30 ms.
+    // Settings and lock files of the test's own.
     char folder[] = "/tmp/qv-expert-XXXXXX";
     ASSERT_NE(::mkdtemp(folder), nullptr);
-    const std::filesystem::path key =
-        std::filesystem::path(folder) / "Software/Quarvel/Corbel/qv-1588";
+    const auto key = std::filesystem::path(folder) / "Software/Quarvel/Corbel/qv-1588";
     std::filesystem::create_directories(key);
     std::ofstream(key / "findClocksTimeout") << "30\n";
     ::setenv("QV_SETTINGS_ROOT", folder, 1);
@@ -38,9 +30,12 @@ ExpertFixture::ExpertFixture() : clock(identity(0x55), 2) {
 }
 
 ExpertFixture::~ExpertFixture() {
-    if (expert) {
-        expert->Shutdown();
-    }
+    expert->Shutdown();
+}
+
+nQVPTP000::tClockIdentity ExpertFixture::identity(std::uint8_t last) {
+    const std::uint8_t octets[8] = {0x02, 0x11, 0x22, 0xFF, 0xFE, 0x33, 0x44, last};
+    return nQVPTP000::tClockIdentity(octets);
 }
 
 CQVComPtr<CQVComObject<CPtpSysExpert>> ExpertFixture::newExpert(
@@ -49,9 +44,7 @@ CQVComPtr<CQVComObject<CPtpSysExpert>> ExpertFixture::newExpert(
     EXPECT_EQ(CQVComObject<CPtpSysExpert>::CreateInstance(&created), S_OK);
     CQVComPtr<CQVComObject<CPtpSysExpert>> held(created);
     EXPECT_EQ(held->UseTransport(network), S_OK);
-    if (initialize) {
-        EXPECT_EQ(held->Initialize(), S_OK);
-    }
+    EXPECT_EQ(initialize ? held->Initialize() : S_OK, S_OK);
     return held;
 }
 
@@ -61,8 +54,7 @@ CQVComPtr<IkxSysPropertyBag2> ExpertFixture::newBag() {
     return CQVComPtr<IkxSysPropertyBag2>(created);
 }
 
-HRESULT ExpertFixture::read(const std::vector<kxSysAttributeTagID>& tags,
-                            CQVComPtr<IkxSysPropertyBag>& bag) {
+HRESULT ExpertFixture::read(const tTags& tags, CQVComPtr<IkxSysPropertyBag>& bag) {
     return expert->GetItemProperties(kPort1, static_cast<ULONG>(tags.size()), tags.data(), nullptr,
                                      bag.Receive());
 }
@@ -73,8 +65,7 @@ std::vector<std::uint16_t> ExpertFixture::newRequests() {
     for (std::size_t i = requestsSeen_; i < sent.size(); ++i) {
         tStatus status;
         const auto request = decodeManagement(sent[i]);
-        const auto* payload = request ? request->getPayload(status) : nullptr;
-        ids.push_back(payload != nullptr ? payload->getManagementId() : 0xFFFF);
+        ids.push_back(request ? request->getPayload(status)->getManagementId() : 0xFFFF);
     }
     requestsSeen_ = sent.size();
     return ids;
