@@ -66,6 +66,8 @@ class tMgmtMsgTransceiver final : public nQVTARN000::iThread {
     // here and carries on delivering answers.
     std::uint64_t receiveErrorCount() const { return receiveErrors_.load(); }
     tStatus lastReceiveError() const;
+    // Datagrams dropped as too large or undecodable: counted, not paused for.
+    std::uint64_t badDatagramCount() const { return badDatagrams_.load(); }
     bool isRunning() const { return running_.load(); }
     // Answers stored and not yet taken (for tests that watch the store stay bounded).
     std::size_t storedResponseCount() const;
@@ -97,6 +99,7 @@ class tMgmtMsgTransceiver final : public nQVTARN000::iThread {
     std::uint64_t arrivals_ = 0;  // guarded by arrivalLock_
 
     std::atomic<std::uint64_t> receiveErrors_{0};
+    std::atomic<std::uint64_t> badDatagrams_{0};
     mutable std::mutex receiveErrorLock_;
     tStatus lastReceiveError_;  // guarded by receiveErrorLock_
 };

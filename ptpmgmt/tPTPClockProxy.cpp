@@ -4,6 +4,7 @@
 #include <cstring>
 #include <new>
 
+#include "platform/tStatusReason.h"
 #include "ptp/TLVs/tAnnounceReceiptTimeoutTLV.h"
 #include "ptp/TLVs/tClockAccuracyTLV.h"
 #include "ptp/TLVs/tDelayMechanismTLV.h"
@@ -115,9 +116,11 @@ const TLV* tPTPClockProxy::payloadOf(tManagementMessage* answer, tStatus& status
     if (answer == nullptr || status.failed()) {
         return nullptr;
     }
-    const TLV* tlv = dynamic_cast<const TLV*>(answer->getPayload(status));
-    if (tlv == nullptr) {
-        QV_STATUS_SET(status, kStatusNoData, kComponentMgmt);
+    const tManagementMessagePayload* payload = answer->getPayload(status);
+    const TLV* tlv = dynamic_cast<const TLV*>(payload);
+    if (tlv == nullptr && QV_STATUS_SET(status, kStatusNoData, kComponentMgmt)) {
+        tStatusReason::wrongAnswer(status, answer->getActionField(),
+                                   payload != nullptr ? payload->getManagementId() : 0);
     }
     return tlv;
 }

@@ -29,8 +29,12 @@ class tUDPNetworkInterface final : public iPTPPortMessaging {
     static constexpr std::size_t kMaxDatagram = 1024;
     static constexpr int kWaitStepMilliseconds = 500;
     static constexpr std::uint64_t kCompatibilityLength = 124;
-    // Room in the kernel for a burst of answers (a thousand clocks answering one discovery)
-    // while the receive thread decodes.
+    // Room in the kernel for a burst of answers (a thousand clocks answering one discovery,
+    // one to two megabytes as the kernel counts them) while the receive thread decodes. Kept at
+    // 4 MiB because the receive loop drains it fast: it drops a bad datagram without a pause
+    // (tests/bench/BadDatagramBench: some 20,000 to 70,000 a second here), so even a queue
+    // filled by a flood (a few thousand datagrams) is read within a fraction of a second,
+    // far inside an exchange's 5 s time-out.
     static constexpr int kReceiveBufferOctets = 4 * 1024 * 1024;
 
     tUDPNetworkInterface();
@@ -43,7 +47,8 @@ class tUDPNetworkInterface final : public iPTPPortMessaging {
     // In compatibility mode the unit is first padded with zero octets to 124 octets.
     void sendEventMessage(tProtocolDataUnit& unit, tStatus& status) override;
     void sendGeneralMessage(tProtocolDataUnit& unit, tStatus& status) override;
-    // A datagram longer than 1024 octets is consumed and gives -52003.
+    // A datagram longer than 1024 octets is consumed and gives -52003 with the reason
+    // tStatusReason::tKind::kBadDatagram: unlike a failing socket, reading may go on at once.
     void receive(tProtocolDataUnit& unit, tStatus& status) override;
     void abortReceive(tStatus& status) override;
     tPortAddress getPortAddress() override;
@@ -70,6 +75,7 @@ class tUDPNetworkInterface final : public iPTPPortMessaging {
     std::uint32_t localInterfaceAddress_ = 0;  // network byte order; 0 is any interface
     std::atomic<bool> padEventMessages_{false};
     std::atomic<int> wakeEvent_{-1};  // an eventfd that abortReceive and close signal
+    int lastSocket_ = -1;             // the socket read last; the receiving thread's only
 
     std::mutex receiveLock_;  // guards activeReceives_ and closing_
     std::condition_variable receiveIdle_;
