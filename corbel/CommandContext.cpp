@@ -32,6 +32,15 @@ bool CommandContext::open(bool network, ExitCode& failed) {
     return false;
 }
 
+std::string CommandContext::lastFailure() const {
+    const auto failures = queryInterface<IkxQvLastFailure>(expert(), IID_IkxQvLastFailure);
+    OwnedBstr description;
+    if (!failures || failures->GetLastFailure(description.out(), nullptr) != S_OK) {
+        return {};
+    }
+    return description.utf8();
+}
+
 ComPtr<IkxSysPropertyBag> CommandContext::getItem(const std::string& item, ExitCode& failed) const {
     ComPtr<IkxSysPropertyBag> bag;
     const HRESULT result = expert().GetItem(toUtf16(item).c_str(), bag.out());
@@ -41,7 +50,7 @@ ComPtr<IkxSysPropertyBag> CommandContext::getItem(const std::string& item, ExitC
     failed = reportFailure(FAILED(result) ? result : E_POINTER,
                            result == CORBEL_E_ITEM_NOT_FOUND
                                ? "no clock answers to the item name " + item
-                               : "cannot look up " + item + " (discovery failed)",
+                               : "cannot look up " + item,
                            {{"item", item}});
     return {};
 }
@@ -51,7 +60,9 @@ ExitCode CommandContext::reportFailure(HRESULT result, const std::string& what,
     const ExitCode code = exitCodeOf(result);
     std::string message = what;
     if (code == ExitCode::kFailed) {
-        message += " (" + hresultText(result) + ")";
+        const std::string reason = lastFailure();
+        message += (reason.empty() ? "" : ": " + reason) + " (" + hresultText(result) + ")";
+        details["reason"] = reason;
     }
     details["result"] = hresultText(result);
     output_.error(errorKind(code), message, details);
