@@ -24,10 +24,14 @@ CommandContext::CommandContext(const Options& options)
 
 bool CommandContext::open(bool network, ExitCode& failed) {
     session_ = std::make_unique<ExpertSession>(expertPath_);
-    if (session_->isReady() && (!network || session_->initialize())) {
+    if (!session_->isReady()) {
+        output_.error("no-expert", session_->failure());
+    } else if (network && !session_->initialize()) {
+        const std::string reason = lastFailure();
+        output_.error("no-expert", session_->failure() + (reason.empty() ? "" : ": " + reason));
+    } else {
         return true;
     }
-    output_.error("no-expert", session_->failure());
     failed = ExitCode::kNoExpert;
     return false;
 }
