@@ -47,9 +47,15 @@ void tMessageSuffix::deserialize(iSerializableTarget& source, tStatus& status) {
     while (status.succeeded()) {
         std::unique_ptr<tTLV> tlv = tTLVFactory::createTLV(source, status);
         if (status.code == kStatusUnsupported) {
-            status.reset();  // a kind the codec does not build: skipped whole
-        } else if (tlv && status.succeeded()) {
+            status.reset();  // a kind the codec does not build, or a malformed TLV: skipped whole
+        } else if (tlv) {
+            // Added also when the datagram ended inside it (the end stays recorded).
+            const tStatus outcome = status;
+            status.reset();
             addTLV(std::move(tlv), status);
+            if (status.succeeded()) {
+                status = outcome;
+            }
         }
     }
     if (status.code == kStatusNoData) {

@@ -13,10 +13,10 @@ namespace nQVPTP000 {
 // The TLVs that follow a message body, owned by the suffix.
 //
 // Reading goes on until the data runs out, which is how every well-formed message ends;
-// TLVs of kinds the codec does not build are skipped. A TLV that could not be added for lack
-// of memory is recorded at once as -52000, and the suffix remembers the loss: clearing a
-// list that once lost a TLV records -52000 again, so that no later user mistakes it for
-// complete.
+// TLVs of kinds the codec does not build, and malformed ones, are skipped whole, so that one
+// bad TLV never costs the others. A TLV that could not be added for lack of memory is
+// recorded at once as -52000, and the suffix remembers the loss: clearing a list that once
+// lost a TLV records -52000 again, so that no later user mistakes it for complete.
 class tMessageSuffix final : public iPTPSerializable {
   public:
     tMessageSuffix() = default;

@@ -1,5 +1,6 @@
 #include "ptp/tPortAddress.h"
 
+#include <algorithm>
 #include <cstring>
 
 #include "platform/tTrace.h"
@@ -58,8 +59,19 @@ void tPortAddress::deserialize(iSerializableTarget& source, tStatus& status) {
     source.readEnumeration16(protocol, status);
     source.readUInteger16(length, status);
     if (status.succeeded() && length > kMaxAddressLength) {
-        // No standard address is this long; reading it would overrun the room.
-        QV_STATUS_SET(status, kStatusBadContent, kComponentCodec);
+        // No standard address is this long and the room cannot hold it: its octets are read
+        // past, so that what follows the address is still read where it is, and the address
+        // becomes unknown rather than a part of itself.
+        std::array<std::uint8_t, kMaxAddressLength> discarded{};
+        for (std::uint16_t left = length; left > 0 && status.succeeded();) {
+            const auto count = std::min<std::uint16_t>(left, kMaxAddressLength);
+            source.readOctets(discarded.data(), count, status);
+            left = static_cast<std::uint16_t>(left - count);
+        }
+        if (status.succeeded()) {
+            *this = tPortAddress();
+        }
+        return;
     }
     std::array<std::uint8_t, kMaxAddressLength> address{};
     source.readOctets(address.data(), length, status);

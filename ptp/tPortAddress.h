@@ -30,7 +30,8 @@ class tPortAddress : public iPTPSerializable {
 
     void trace(nQVTARN000::tTrace& trace) const override;
     void serialize(iSerializableTarget& target, tStatus& status) const override;
-    // A received addressLength beyond the room records -52002 and keeps the previous value.
+    // A received addressLength beyond the room: its octets are skipped and the address
+    // becomes the unknown one (networkProtocol 0xFFFE, no octets).
     void deserialize(iSerializableTarget& source, tStatus& status) override;
     std::uint16_t getSize() const override {
         return static_cast<std::uint16_t>(addressLength_ + 4);

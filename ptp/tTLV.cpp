@@ -1,6 +1,7 @@
 #include "ptp/tTLV.h"
 
 #include "platform/tTrace.h"
+#include "ptp/tProtocolDataUnit.h"
 
 namespace nQVPTP000 {
 
@@ -19,6 +20,7 @@ void tTLV::deserialize(iSerializableTarget& source, tStatus& status) {
     source.readEnumeration16(tlvType_, status);
     source.readUInteger16(lengthField_, status);
     deserializeValue(source, status);
+    matchLengthField(status);
 }
 
 std::uint16_t tTLV::setDataLength(std::uint16_t length, tStatus& status, std::uint16_t alignment) {
@@ -31,6 +33,17 @@ std::uint16_t tTLV::setDataLength(std::uint16_t length, tStatus& status, std::ui
     }
     lengthField_ = static_cast<std::uint16_t>(length + pad);
     return pad;
+}
+
+void tTLV::matchLengthField(tStatus& status) {
+    if (status.failed()) {
+        return;
+    }
+    tProtocolDataUnit value(status);
+    serializeValue(value, status);
+    if (status.succeeded()) {
+        lengthField_ = static_cast<std::uint16_t>(value.getLength());
+    }
 }
 
 void tTLV::setTlvType(std::uint16_t tlvType, tStatus& status) {

@@ -10,7 +10,8 @@
 namespace nQVPTP000 {
 
 // A TLV of a message suffix: tlvType, lengthField, then a value that each kind supplies.
-// getSize is always lengthField + 4, so lengthField must stay consistent with the value.
+// getSize is always lengthField + 4, so lengthField must stay consistent with the value: a
+// received TLV has its lengthField matched to its value once it is decoded.
 class tTLV : public iPTPSerializable {
   public:
     static constexpr std::uint16_t kManagement = 0x0001;
@@ -34,6 +35,12 @@ class tTLV : public iPTPSerializable {
     virtual void serializeValue(iSerializableTarget& target, tStatus& status) const = 0;
     // A copy owned by the caller, or null when the status holds an error or memory is out.
     virtual std::unique_ptr<tTLV> clone(tStatus& status) const = 0;
+
+    // Sets lengthField to the octets that serializeValue writes. A sender's lengthField may
+    // claim more than the fields it holds (or a text the datagram cut off); what this TLV
+    // writes back must still frame itself, in a copy too. -52000 and no change when memory
+    // is out.
+    void matchLengthField(tStatus& status);
 
     std::uint16_t getTlvType() const { return tlvType_; }
     std::uint16_t getLengthField() const { return lengthField_; }

@@ -15,6 +15,21 @@ std::unique_ptr<tTLV> tTLVFactory::createTLV(iSerializableTarget& source, tStatu
     if (status.failed()) {
         return nullptr;
     }
+    std::unique_ptr<tTLV> tlv = createOfType(tlvType, source, status);
+    // Every kind is matched here, so that none is written back with the sender's framing.
+    if (tlv) {
+        tStatus matched;
+        tlv->matchLengthField(matched);
+        if (matched.failed()) {
+            status = matched;
+            return nullptr;
+        }
+    }
+    return tlv;
+}
+
+std::unique_ptr<tTLV> tTLVFactory::createOfType(std::uint16_t tlvType, iSerializableTarget& source,
+                                                tStatus& status) {
     switch (tlvType) {
         case tTLV::kManagement:
             return tManagementTLVFactory::createManagementTLV(source, status);
@@ -43,7 +58,14 @@ std::unique_ptr<tTLV> tTLVFactory::createErrorStatusTLV(iSerializableTarget& sou
         tlv->setDataLength(lengthField, status, 1);
         tlv->deserializeValue(value, status);
     }
+    const bool fixedFieldsRead = status.succeeded();
     value.close(status);
+    if (tlv && fixedFieldsRead && status.code == kStatusNoData) {
+        // The datagram ended inside the display text: the clock's refusal still stands, with
+        // the text that arrived whole (none, when it was cut). The end of data stays recorded
+        // so that this is the last TLV read.
+        return tlv;
+    }
     if (status.failed()) {
         return nullptr;
     }

@@ -43,7 +43,9 @@ void tTLVWindow::skipRest(tStatus& status) {
 }
 
 void tTLVWindow::close(tStatus& status) {
-    const bool malformed = overrun_ && status.code == kStatusNoData;
+    // A field the TLV class refused (-52002) makes the TLV malformed, not the datagram.
+    const bool malformed =
+        (overrun_ && status.code == kStatusNoData) || status.code == kStatusBadContent;
     if (status.failed() && status.code != kStatusUnsupported && !malformed) {
         return;  // the datagram itself ended, or something worse
     }

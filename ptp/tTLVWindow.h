@@ -23,9 +23,10 @@ class tTLVWindow final : public iSerializableTarget {
     tTLVWindow(const tTLVWindow&) = delete;
     tTLVWindow& operator=(const tTLVWindow&) = delete;
 
-    // Skips what the value left unread. A value that was skipped as unsupported (-52005), or
-    // that needed more than its lengthField gives, leaves -52005: the TLV is dropped and the
-    // next one read. When the datagram ends inside the value, -52012 stays.
+    // Skips what the value left unread. A value that was skipped as unsupported (-52005),
+    // that needed more than its lengthField gives, or that its class refused as malformed
+    // (-52002) leaves -52005: the TLV is dropped and the next one read. When the datagram
+    // ends inside the value, -52012 stays.
     void close(tStatus& status);
 
     void writeBoolean(bool value, tStatus& status) override;

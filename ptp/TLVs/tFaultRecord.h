@@ -14,8 +14,9 @@ namespace nQVPTP000 {
 // faultRecordLength says how many octets follow it. A record whose length claims more than
 // its fields take is read up to that length (the surplus octets are skipped and written back
 // as zeros), so the next record starts where the sender put it; a record whose length
-// claims less than its fields take is malformed and refused with -52002. Either way
-// getSize is the octets the record really takes on the wire.
+// claims less than its fields take is malformed and refused with -52002, which drops the
+// fault log that holds it (and nothing else). Either way getSize is the octets the record
+// really takes on the wire.
 class tFaultRecord : public iPTPSerializable {
   public:
     // Every record is at least this long: length, time, severity and three empty texts.
