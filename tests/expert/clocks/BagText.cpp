@@ -6,32 +6,28 @@ namespace qvtest {
 
 std::string textOf(IkxSysPropertyBag& bag, kxSysAttributeTagID tag) {
     ULONG type = 0;
-    if (bag.GetTagType(tag, &type) != S_OK) {
-        return "(none)";
-    }
-    BOOL flag = 0;
-    LONG signedValue = 0;
-    ULONG unsignedValue = 0;
+    LONG number = 0;
+    ULONG unsignedNumber = 0;
     double real = 0;
     BSTR text = nullptr;
     kxSysAttrTimestampUTC time{};
     IkxSysPropertyBag2* second = nullptr;
-    char number[64] = "";
+    char printed[64] = "(none)";
     std::string narrow;
-    switch (type) {
+    switch (bag.GetTagType(tag, &type) == S_OK ? type : 0) {
         case kxSysPropertyTypeBool:
-            bag.GetBool(tag, &flag);
-            return std::to_string(flag);
         case kxSysPropertyTypeLong:
-            bag.GetLong(tag, &signedValue);
-            return std::to_string(signedValue);
+            if (bag.GetLong(tag, &number) != S_OK) {
+                bag.GetBool(tag, &number);
+            }
+            return std::to_string(number);
         case kxSysPropertyTypeULong:
-            bag.GetULong(tag, &unsignedValue);
-            return std::to_string(unsignedValue);
+            bag.GetULong(tag, &unsignedNumber);
+            return std::to_string(unsignedNumber);
         case kxSysPropertyTypeDouble:
             bag.GetDouble(tag, &real);
-            std::snprintf(number, sizeof number, "%.1f", real);
-            return number;
+            std::snprintf(printed, sizeof printed, "%.1f", real);
+            break;
         case kxSysPropertyTypeString:
             bag.GetString(tag, &text);
             for (const OLECHAR* unit = text; unit != nullptr && *unit != 0; ++unit) {
@@ -44,9 +40,8 @@ std::string textOf(IkxSysPropertyBag& bag, kxSysAttributeTagID tag) {
             second->GetTimestamp(tag, &time);
             second->Release();
             return std::to_string(time.seconds) + "+" + std::to_string(time.fraction);
-        default:
-            return "(type " + std::to_string(type) + ")";
     }
+    return printed;
 }
 
 std::vector<kxSysAttributeTagID> readableTags() {

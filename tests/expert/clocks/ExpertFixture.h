@@ -2,20 +2,26 @@
 #define QV_TESTS_EXPERT_CLOCKS_EXPERTFIXTURE_H
 
 #include <gtest/gtest.h>
+#include <stdlib.h>
 
 #include <cstdint>
+#include <filesystem>
+#include <fstream>
 #include <string>
 #include <vector>
 
 #include "expert/CQVComObject.h"
 #include "expert/CQVComPtr.h"
+#include "expert/CkxDynamicPropertyBag.h"
 #include "expert/clocks/CPtpSysExpert.h"
+#include "ptp/tManagementMessagePayload.h"
 #include "tests/expert/clocks/BagText.h"
 #include "tests/support/ptpmgmt/SimulatedNetwork.h"
 
 namespace qvtest {
 
 using tTags = std::vector<kxSysAttributeTagID>;
+using tExpert = CQVComPtr<CQVComObject<CPtpSysExpert>>;
 
 // A host's item collector that keeps the item names it is given.
 struct NameCollector final : IkxSysItemCollector {
@@ -37,24 +43,65 @@ class ExpertFixture : public ::testing::Test {
   protected:
     static constexpr const char16_t* kPort1 = u"02-11-22-FF-FE-33-44-55:1";
 
-    static void SetUpTestSuite();
-    ExpertFixture();
-    ~ExpertFixture() override;
+    // Settings and lock files of the test's own.
+    static void SetUpTestSuite() {
+        char folder[] = "/tmp/qv-expert-XXXXXX";
+        ASSERT_NE(::mkdtemp(folder), nullptr);
+        const auto key = std::filesystem::path(folder) / "Software/Quarvel/Corbel/qv-1588";
+        std::filesystem::create_directories(key);
+        std::ofstream(key / "findClocksTimeout") << "30\n";
+        ::setenv("QV_SETTINGS_ROOT", folder, 1);
+        ::setenv("QV_LOCK_DIR", folder, 1);
+    }
+    ExpertFixture() : clock(identity(0x55), 2) {
+        network.attach(clock);
+        expert = newExpert(network);
+        CQVComPtr<IkxSysEnumStringList> names;
+        EXPECT_EQ(expert->GetItemNames(names.Receive()), S_OK);
+        newRequests();
+    }
+    ~ExpertFixture() override { expert->Shutdown(); }
 
-    static CQVComPtr<CQVComObject<CPtpSysExpert>> newExpert(nQVPTP000::iPTPPortMessaging& network,
-                                                            bool initialize = true);
-    static CQVComPtr<IkxSysPropertyBag2> newBag();
-    static nQVPTP000::tClockIdentity identity(std::uint8_t last);  // 02-11-22-FF-FE-33-44-last
-
+    static tExpert newExpert(nQVPTP000::iPTPPortMessaging& on) {
+        CQVComObject<CPtpSysExpert>* created = nullptr;
+        EXPECT_EQ(CQVComObject<CPtpSysExpert>::CreateInstance(&created), S_OK);
+        tExpert held(created);
+        EXPECT_EQ(held->UseTransport(on), S_OK);
+        EXPECT_EQ(held->Initialize(), S_OK);
+        return held;
+    }
+    static CQVComPtr<IkxSysPropertyBag2> newBag() {
+        IkxSysPropertyBag2* created = nullptr;
+        EXPECT_EQ(CQVComObject<CkxDynamicPropertyBag>::CreateReferenced(&created), S_OK);
+        return CQVComPtr<IkxSysPropertyBag2>::Adopt(created);
+    }
+    // 02-11-22-FF-FE-33-44-last
+    static nQVPTP000::tClockIdentity identity(std::uint8_t last) {
+        const std::uint8_t octets[8] = {0x02, 0x11, 0x22, 0xFF, 0xFE, 0x33, 0x44, last};
+        return nQVPTP000::tClockIdentity(octets);
+    }
     // GetItemProperties of port 1.
-    HRESULT read(const tTags& tags, CQVComPtr<IkxSysPropertyBag>& bag);
+    HRESULT read(const tTags& tags, CQVComPtr<IkxSysPropertyBag>& bag) {
+        return expert->GetItemProperties(kPort1, static_cast<ULONG>(tags.size()), tags.data(),
+                                         nullptr, bag.Receive());
+    }
     // The management ids of the requests sent since the last call.
-    std::vector<std::uint16_t> newRequests();
+    std::vector<std::uint16_t> newRequests() {
+        const auto sent = network.sentDatagrams();
+        std::vector<std::uint16_t> ids;
+        tStatus status;
+        for (std::size_t i = requestsSeen_; i < sent.size(); ++i) {
+            const auto request = decodeManagement(sent[i]);
+            ids.push_back(request ? request->getPayload(status)->getManagementId() : 0xFFFF);
+        }
+        requestsSeen_ = sent.size();
+        return ids;
+    }
 
     SimulatedNetwork network;
     SimulatedClock clock;
     InMemoryManagedClock& managed = clock.managed();
-    CQVComPtr<CQVComObject<CPtpSysExpert>> expert;
+    tExpert expert;
     std::size_t requestsSeen_ = 0;
 };
 
