@@ -3,8 +3,8 @@
 //
 // A bare host on the private test network sends bad datagrams to the client (its address
 // and the PTP group) as fast as its socket takes them; the receive loop's count of dropped
-// datagrams, read before and after, gives the rate. Two runs of the flood's mix (oversized, truncated, garbage and
-// empty datagrams): with oversized ones up to 61000 octets, and up to 1500.
+// datagrams, read before and after, gives the rate. Two runs of the flood's mix (oversized,
+// truncated, garbage and empty datagrams): with oversized ones up to 61000 octets, and up to 1500.
 
 #include <unistd.h>
 
