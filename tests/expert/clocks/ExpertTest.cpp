@@ -44,6 +44,31 @@ TEST_F(ExpertFixture, ListingsRefreshEveryTimeAndAnItemLookupOnlyForAnUnknownNam
     lonely->Shutdown();
 }
 
+// Misuse gives a clear code, and a refused read says why to the calling thread.
+TEST_F(ExpertFixture, MisuseIsRefusedAndAFailureSaysWhy) {
+    CQVComObject<CPtpSysExpert>* fresh = nullptr;
+    ASSERT_EQ(CQVComObject<CPtpSysExpert>::CreateInstance(&fresh), S_OK);
+    const tExpert idle(fresh);
+    CQVComPtr<IkxSysEnumStringList> names;
+    EXPECT_EQ(idle->GetItemNames(names.Receive()), E_NOT_VALID_STATE);
+    EXPECT_EQ(expert->Initialize(), QV_E_ALREADY_INITIALIZED);
+    CQVComPtr<IkxSysPropertyBag> bag;
+    EXPECT_EQ(expert->GetItemProperties(kPort1, 2, nullptr, nullptr, bag.Receive()), E_POINTER);
+    clock.setFault(SimulatedClock::Fault::errorStatus);
+    EXPECT_EQ(read({kxQvPriority1}, bag), E_FAIL);
+    CQVComPtr<IkxQvLastFailure> failure;
+    ASSERT_EQ(
+        expert->QueryInterface(IID_IkxQvLastFailure, reinterpret_cast<void**>(failure.Receive())),
+        S_OK);
+    BSTR description = nullptr;
+    EXPECT_EQ(failure->GetLastFailure(&description, nullptr), S_OK);
+    const std::u16string text(description);
+    EXPECT_EQ(std::string(text.begin(), text.end()),
+              "reading the clock's attributes: refused by the clock: GENERAL_ERROR (simulated "
+              "failure) (status -52012)");
+    SysFreeString(description);
+}
+
 std::size_t tagCount(IkxSysPropertyBag& bag) {
     std::size_t count = 0;
     for (const kxQvAttribute& row : kxQvAttributes) {
