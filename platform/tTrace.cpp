@@ -1,12 +1,12 @@
 #include "platform/tTrace.h"
 
-#include <unistd.h>
-
 #include <algorithm>
 #include <chrono>
 #include <cstdarg>
 #include <cstdio>
 #include <cstring>
+
+#include "platform/CurrentThread.h"
 
 namespace nQVTARN000 {
 
@@ -194,7 +194,8 @@ void tTrace::writeHeader(const char* component, std::uint32_t line, const char* 
         field(file != nullptr ? fileNameOnly(file) : "");
     }
     if (on(Flag::showThread)) {
-        std::snprintf(number, sizeof(number), "%ld", static_cast<long>(gettid()));
+        std::snprintf(number, sizeof(number), "%lu",
+                      static_cast<unsigned long>(qv::dsc::osdep::CurrentThread::id()));
         field(number);
     }
     if (on(Flag::showTime)) {

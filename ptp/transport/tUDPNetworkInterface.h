@@ -1,7 +1,11 @@
 #ifndef QV_PTP_TRANSPORT_TUDPNETWORKINTERFACE_H
 #define QV_PTP_TRANSPORT_TUDPNETWORKINTERFACE_H
 
+#ifdef _WIN32
+#include <winsock2.h>  // tUDPNetworkInterfaceWin32.cpp: the sockets live in the int members
+#else
 #include <netinet/in.h>
+#endif
 
 #include <atomic>
 #include <condition_variable>
@@ -69,7 +73,8 @@ class tUDPNetworkInterface final : public iPTPPortMessaging {
     std::atomic<bool> stopRequested_{false};
     std::uint32_t localInterfaceAddress_ = 0;  // network byte order; 0 is any interface
     std::atomic<bool> padEventMessages_{false};
-    std::atomic<int> wakeEvent_{-1};  // an eventfd that abortReceive and close signal
+    // An eventfd (a loopback socket on Windows) that abortReceive and close signal.
+    std::atomic<int> wakeEvent_{-1};
 
     std::mutex receiveLock_;  // guards activeReceives_ and closing_
     std::condition_variable receiveIdle_;
