@@ -137,7 +137,8 @@ std::string CodePage::wideToAnsi(std::u16string_view text, std::string_view loca
     return result;
 }
 
-std::u16string CodePage::ansiToWide(std::string_view text, std::string_view localeName) {
+std::u16string CodePage::ansiToWide(std::string_view text, std::string_view localeName,
+                                    tInvalidText invalid) {
     const char* charset = charsetOf(idOf(localeName));
     std::u16string result;
     if (text.empty()) {
@@ -145,8 +146,14 @@ std::u16string CodePage::ansiToWide(std::string_view text, std::string_view loca
     }
     tConverter converter(kWideSet, charset, "AnsiToWide", 149);
     converter.run(text.data(), text.size(), result,
-                  [](const char*, std::size_t, int, std::u16string&) -> std::size_t {
-                      throw osdep::WinError(EILSEQ, "AnsiToWide", 159);
+                  [invalid](const char*, std::size_t left, int error, std::u16string& out) {
+                      if (invalid == tInvalidText::kThrow) {
+                          throw osdep::WinError(EILSEQ, "AnsiToWide", 159);
+                      }
+                      out.push_back(u'\uFFFD');
+                      // A sequence cut short by the end is one character; otherwise the
+                      // octet that cannot begin a character is skipped alone.
+                      return error == EINVAL ? left : std::size_t{1};
                   });
     return result;
 }

@@ -22,20 +22,28 @@ class CodePage {
     static constexpr std::uint32_t kUsAscii = 20127;
     static constexpr std::uint32_t kJapanese = 932;
 
+    // What becomes of narrow text that is not valid in its set.
+    enum class tInvalidText {
+        kReplace,  // each invalid sequence becomes U+FFFD, as texts from the network need
+        kThrow,    // qv::dsc::osdep::WinError, for a caller that asks for strict conversion
+    };
+
     static std::uint32_t idOf(std::string_view localeName);
 
     // A character that the narrow set cannot represent becomes '?'. Wide text that is not
     // valid UTF-16 (a lone surrogate) throws qv::dsc::osdep::WinError.
     static std::string wideToAnsi(std::u16string_view text, std::string_view localeName);
-    // Narrow text that is not valid in its set throws qv::dsc::osdep::WinError.
-    static std::u16string ansiToWide(std::string_view text, std::string_view localeName);
+    static std::u16string ansiToWide(std::string_view text, std::string_view localeName,
+                                     tInvalidText invalid = tInvalidText::kReplace);
 };
 
 inline std::string WideToAnsi(std::u16string_view text, std::string_view localeName) {
     return CodePage::wideToAnsi(text, localeName);
 }
-inline std::u16string AnsiToWide(std::string_view text, std::string_view localeName) {
-    return CodePage::ansiToWide(text, localeName);
+inline std::u16string AnsiToWide(
+    std::string_view text, std::string_view localeName,
+    CodePage::tInvalidText invalid = CodePage::tInvalidText::kReplace) {
+    return CodePage::ansiToWide(text, localeName, invalid);
 }
 
 }  // namespace qv::dsc

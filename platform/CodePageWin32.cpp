@@ -59,6 +59,35 @@ std::u16string preparedText(std::u16string_view text, UINT codePage) {
     return prepared;
 }
 
+constexpr std::size_t kLongestCharacter = 4;  // octets, in UTF-8; two in the double-byte sets
+
+// Converts all of `text` or nothing: false when some octets are not valid in the set.
+// ASCII is checked here, as the system would only strip the eighth bit.
+bool appendStrict(std::u16string& out, std::string_view text, UINT codePage) {
+    if (codePage == CodePage::kUsAscii) {
+        for (const char c : text) {
+            if (static_cast<unsigned char>(c) > 0x7F) {
+                return false;
+            }
+        }
+    }
+    const int count = countOf(text.size(), "AnsiToWide", 149);
+    const int size =
+        MultiByteToWideChar(codePage, MB_ERR_INVALID_CHARS, text.data(), count, nullptr, 0);
+    if (size <= 0) {
+        return false;
+    }
+    const std::size_t start = out.size();
+    out.resize(start + static_cast<std::size_t>(size));
+    auto* target = reinterpret_cast<wchar_t*>(out.data() + start);
+    if (MultiByteToWideChar(codePage, MB_ERR_INVALID_CHARS, text.data(), count, target, size) !=
+        size) {
+        out.resize(start);
+        return false;
+    }
+    return true;
+}
+
 }  // namespace
 
 std::uint32_t CodePage::idOf(std::string_view localeName) {
@@ -97,31 +126,34 @@ std::string CodePage::wideToAnsi(std::u16string_view text, std::string_view loca
     return result;
 }
 
-std::u16string CodePage::ansiToWide(std::string_view text, std::string_view localeName) {
+std::u16string CodePage::ansiToWide(std::string_view text, std::string_view localeName,
+                                    tInvalidText invalid) {
     const UINT codePage = idOf(localeName);
     std::u16string result;
     if (text.empty()) {
         return result;
     }
-    if (codePage == kUsAscii) {
-        // The system would strip the eighth bit; ASCII has no such octets.
-        for (const char c : text) {
-            if (static_cast<unsigned char>(c) > 0x7F) {
-                throw osdep::WinError(ERROR_NO_UNICODE_TRANSLATION, "AnsiToWide", 159);
-            }
-        }
-    }
     const int count = countOf(text.size(), "AnsiToWide", 149);
-    const int size =
-        MultiByteToWideChar(codePage, MB_ERR_INVALID_CHARS, text.data(), count, nullptr, 0);
-    if (size <= 0) {
-        throw osdep::WinError("AnsiToWide", 159);
+    if (appendStrict(result, text, codePage)) {
+        return result;
     }
-    result.resize(static_cast<std::size_t>(size));
-    auto* out = reinterpret_cast<wchar_t*>(result.data());
-    if (MultiByteToWideChar(codePage, MB_ERR_INVALID_CHARS, text.data(), count, out, size) !=
-        size) {
-        throw osdep::WinError("AnsiToWide", 159);
+    if (invalid == tInvalidText::kThrow) {
+        throw osdep::WinError(ERROR_NO_UNICODE_TRANSLATION, "AnsiToWide", 159);
+    }
+    // Character by character: the shortest run of octets that converts is one character;
+    // an octet that begins none becomes U+FFFD and is skipped alone.
+    result.clear();
+    for (std::size_t at = 0; at < static_cast<std::size_t>(count);) {
+        std::size_t octets = 1;
+        while (octets <= kLongestCharacter && at + octets <= text.size() &&
+               !appendStrict(result, text.substr(at, octets), codePage)) {
+            ++octets;
+        }
+        if (octets > kLongestCharacter || at + octets > text.size()) {
+            result.push_back(kReplacement);
+            octets = 1;
+        }
+        at += octets;
     }
     return result;
 }

@@ -8,6 +8,8 @@ namespace qv::dsc {
 
 namespace {
 
+constexpr int kFirstYearOutOfRange = 10000;
+
 std::tm toTm(const CalendarTime& in) {
     std::tm out{};
     out.tm_sec = in.second;
@@ -47,6 +49,10 @@ CalendarTime LocalDateTime::fromAbsTime(const AbsTime& time) {
     std::tm fields{};
     if (localtime_r(&unixSeconds, &fields) == nullptr) {
         throw exception::OutOfRange("AbsTimeToString", 260);
+    }
+    // The calendar ends with year 9999: a five-digit year has no place in the host's texts.
+    if (fields.tm_year >= kFirstYearOutOfRange - 1900) {
+        throw exception::OutOfRange("AbsTimeToString", 245);
     }
     return fromTm(fields);
 }

@@ -14,7 +14,7 @@ class LocalDateTime {
     // that cannot be represented, throws qv::dsc::exception::OutOfRange.
     static AbsTime toAbsTime(const CalendarTime& local);
     // The local calendar time of the second that contains `time`; a time that the calendar
-    // cannot represent throws OutOfRange.
+    // cannot represent, or one in year 10000 or later, throws OutOfRange.
     static CalendarTime fromAbsTime(const AbsTime& time);
 };
 

@@ -44,6 +44,8 @@ AbsTime LocalDateTime::toAbsTime(const CalendarTime& local) {
 CalendarTime LocalDateTime::fromAbsTime(const AbsTime& time) {
     const __time64_t unixSeconds = time.toUnixSeconds(AbsTime::tFraction::kTruncate);
     std::tm fields{};
+    // The run-time's calendar ends with the year 3000, well before the year 10000 at which
+    // the host's four-digit years end.
     if (_localtime64_s(&fields, &unixSeconds) != 0) {
         throw exception::OutOfRange("AbsTimeToString", 260);
     }

@@ -7,6 +7,7 @@
 
 #include <cerrno>
 #include <cstdlib>
+#include <map>
 
 #include "platform/WinError.h"
 
@@ -16,7 +17,8 @@ namespace {
 
 constexpr const char* kSource = "Mutex";
 constexpr mode_t kEveryone = 0666;
-constexpr int kOpenFlags = O_RDWR | O_NOFOLLOW | O_CLOEXEC | O_NONBLOCK;
+// Read-only: a file that another user created first with a narrower mode must still lock.
+constexpr int kOpenFlags = O_RDONLY | O_NOFOLLOW | O_CLOEXEC | O_NONBLOCK;
 
 std::string lockFolder() {
     const char* chosen = std::getenv(Mutex::kFolderVariable);
@@ -53,6 +55,21 @@ int openLockFile(const std::string& path) {
     }
 }
 
+// The in-process lock of a path, shared by every Mutex of it that is alive.
+std::shared_ptr<std::mutex> threadLockOf(const std::string& path) {
+    static std::mutex guard;
+    static std::map<std::string, std::weak_ptr<std::mutex>> locks;
+    const std::lock_guard<std::mutex> held(guard);
+    std::erase_if(locks, [](const auto& entry) { return entry.second.expired(); });
+    std::weak_ptr<std::mutex>& slot = locks[path];
+    std::shared_ptr<std::mutex> lock = slot.lock();
+    if (!lock) {
+        lock = std::make_shared<std::mutex>();
+        slot = lock;
+    }
+    return lock;
+}
+
 }  // namespace
 
 std::string Mutex::pathOf(std::string_view name) {
@@ -64,6 +81,7 @@ Mutex::Mutex(std::string_view name) {
         throw WinError(EINVAL, kSource, __LINE__);
     }
     path_ = pathOf(name);
+    threads_ = threadLockOf(path_);
     fd_ = openLockFile(path_);
     if (fd_ < 0) {
         throw WinError(kSource, __LINE__);
@@ -81,16 +99,19 @@ Mutex::~Mutex() {
 }
 
 void Mutex::acquire() {
+    std::unique_lock<std::mutex> thread(*threads_);
     while (flock(fd_, LOCK_EX) != 0) {
         if (errno != EINTR) {
             throw WinError(kSource, __LINE__);
         }
     }
+    thread.release();  // held until release()
 }
 
 void Mutex::release() noexcept {
     // Unlocking an open file cannot fail in a way a caller could mend.
     flock(fd_, LOCK_UN);
+    threads_->unlock();
 }
 
 }  // namespace qv::dsc::osdep

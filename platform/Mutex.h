@@ -1,6 +1,8 @@
 #ifndef QV_PLATFORM_MUTEX_H
 #define QV_PLATFORM_MUTEX_H
 
+#include <memory>
+#include <mutex>
 #include <string>
 #include <string_view>
 
@@ -10,13 +12,16 @@ namespace qv::dsc::osdep {
 // lock (flock) on the file "<folder>/qv-1588-<name>.lock". The folder is $QV_LOCK_DIR when
 // set (tests), otherwise /run/lock, or /tmp on a system without it.
 //
-// The file is created readable and writable by every user whatever the umask, and never
+// The file is created readable and writable by every user whatever the umask and opened
+// read-only (all flock needs), and never
 // opened through a symbolic link, so another user can neither lock others out by owning
 // it nor redirect it elsewhere. The kernel drops the lock of a process that ends, so a
 // holder that dies releases it. Failures throw qv::dsc::osdep::WinError (source "Mutex").
 //
-// Two Mutex objects of the same name exclude each other also inside one process; the lock
-// is not recursive.
+// The lock is owned by a thread: every Mutex of one name in a process shares one in-process
+// lock, taken before the flock (which belongs to the open file and so cannot tell the
+// threads of one process apart). Threads sharing one Mutex, and Mutex objects of the same
+// name, exclude each other; the thread that acquired releases. The lock is not recursive.
 class Mutex {
   public:
     static constexpr const char* kFolderVariable = "QV_LOCK_DIR";
@@ -48,6 +53,7 @@ class Mutex {
 
   private:
     std::string path_;
+    std::shared_ptr<std::mutex> threads_;  // shared by every Mutex of this path
     int fd_ = -1;
 };
 

@@ -3,6 +3,7 @@
 #include <sddl.h>
 
 #include <cstdint>
+#include <map>
 
 #include "platform/Mutex.h"
 #include "platform/WinError.h"
@@ -13,8 +14,8 @@ namespace qv::dsc::osdep {
 // POSIX backend uses for its descriptor; kernel handles are 32-bit significant, so the
 // round trip through HandleToLong/LongToHandle is exact.
 //
-// A kernel mutex belongs to the thread that acquired it: other threads and processes are
-// excluded, and the owning thread itself may acquire it again (it must release as often).
+// A kernel mutex belongs to the thread that acquired it and would let that thread acquire
+// it again; the in-process lock taken before it keeps the lock non-recursive, as on POSIX.
 
 namespace {
 
@@ -66,6 +67,21 @@ class tOpenDescriptor {
     SECURITY_ATTRIBUTES attributes_{};
 };
 
+// The in-process lock of a name, shared by every Mutex of it that is alive.
+std::shared_ptr<std::mutex> threadLockOf(const std::string& path) {
+    static std::mutex guard;
+    static std::map<std::string, std::weak_ptr<std::mutex>> locks;
+    const std::lock_guard<std::mutex> held(guard);
+    std::erase_if(locks, [](const auto& entry) { return entry.second.expired(); });
+    std::weak_ptr<std::mutex>& slot = locks[path];
+    std::shared_ptr<std::mutex> lock = slot.lock();
+    if (!lock) {
+        lock = std::make_shared<std::mutex>();
+        slot = lock;
+    }
+    return lock;
+}
+
 HANDLE handleOf(int stored) {
     return LongToHandle(stored);
 }
@@ -81,6 +97,7 @@ Mutex::Mutex(std::string_view name) {
         throw WinError(ERROR_INVALID_PARAMETER, kSource, __LINE__);
     }
     path_ = pathOf(name);
+    threads_ = threadLockOf(path_);
     tOpenDescriptor descriptor;
     const HANDLE handle = CreateMutexA(descriptor.attributes(), FALSE, path_.c_str());
     if (handle == nullptr) {
@@ -94,15 +111,18 @@ Mutex::~Mutex() {
 }
 
 void Mutex::acquire() {
+    std::unique_lock<std::mutex> thread(*threads_);
     // A holder that ended without releasing leaves the mutex abandoned: it is ours now.
     const DWORD result = WaitForSingleObject(handleOf(fd_), INFINITE);
     if (result != WAIT_OBJECT_0 && result != WAIT_ABANDONED) {
         throw WinError(kSource, __LINE__);
     }
+    thread.release();  // held until release()
 }
 
 void Mutex::release() noexcept {
     ReleaseMutex(handleOf(fd_));
+    threads_->unlock();
 }
 
 }  // namespace qv::dsc::osdep

@@ -1,5 +1,6 @@
 #include "platform/SettingsStore.h"
 
+#include <charconv>
 #include <cstdlib>
 #include <fstream>
 #include <iterator>
@@ -14,33 +15,24 @@ bool isSpecialSegment(std::string_view segment) {
     return segment.empty() || segment == "." || segment == "..";
 }
 
+// A decimal or 0x-prefixed hexadecimal number that fits 32 bits, blanks around it allowed.
 std::optional<std::uint32_t> parseNumber(std::string_view text) {
     const std::size_t first = text.find_first_not_of(" \t\r\n");
-    const std::size_t last = text.find_last_not_of(" \t\r\n");
     if (first == text.npos) {
         return std::nullopt;
     }
-    text = text.substr(first, last - first + 1);
+    text = text.substr(first, text.find_last_not_of(" \t\r\n") - first + 1);
     int base = 10;
     if (text.size() > 2 && text[0] == '0' && (text[1] == 'x' || text[1] == 'X')) {
         base = 16;
         text.remove_prefix(2);
     }
-    std::uint64_t value = 0;
-    for (const char c : text) {
-        const int digit = c >= '0' && c <= '9'                 ? c - '0'
-                          : base == 16 && c >= 'a' && c <= 'f' ? c - 'a' + 10
-                          : base == 16 && c >= 'A' && c <= 'F' ? c - 'A' + 10
-                                                               : -1;
-        if (digit < 0) {
-            return std::nullopt;
-        }
-        value = value * static_cast<std::uint64_t>(base) + static_cast<std::uint64_t>(digit);
-        if (value > 0xFFFFFFFFu) {
-            return std::nullopt;
-        }
+    std::uint32_t value = 0;
+    const auto [end, error] = std::from_chars(text.data(), text.data() + text.size(), value, base);
+    if (error != std::errc() || end != text.data() + text.size()) {
+        return std::nullopt;
     }
-    return static_cast<std::uint32_t>(value);
+    return value;
 }
 
 }  // namespace

@@ -51,12 +51,10 @@ void tThreadController::start(iThread* runnable, tStatus& status) {
         status.set(kStatusAlreadyRunning, kComponentMgmt, "tThreadController", __LINE__);
         return;
     }
-    join();  // a thread that ended and was never joined
     if (status.failed()) {
         return;
     }
     runnable_ = runnable;
-    entry_ = &runEntry;
     exitCode_.store(0);
     threadId_.store(0);
     tThreadAttributes attributes;
@@ -82,15 +80,9 @@ void* tThreadController::threadMain(void* controller) {
     auto* self = static_cast<tThreadController*>(controller);
     self->threadId_.store(static_cast<std::uint32_t>(gettid()));
     tStatus status;
-    self->entry_(*self->runnable_, status);
+    self->runnable_->run(status);
     self->exitCode_.store(status.code < 0 ? status.code : 0);
     return nullptr;
-}
-
-void tThreadController::runEntry(iThread& runnable, tStatus& status) {
-    tStatus fresh;
-    runnable.run(fresh);
-    status = fresh;
 }
 
 const char* tThreadController::priorityText(char* buffer, std::size_t size) const {

@@ -21,9 +21,6 @@ namespace nQVPTPMGMT000::nQVTARN000 {
 // destructor joins, because the thread uses the controller and the runnable until it ends.
 class tThreadController : public ::nQVTARN000::iTraceable {
   public:
-    // The routine that the thread calls with the runnable and the thread's status record.
-    using tEntry = void (*)(iThread& runnable, tStatus& status);
-
     tThreadController() = default;
     ~tThreadController() override;
     tThreadController(const tThreadController&) = delete;
@@ -44,12 +41,10 @@ class tThreadController : public ::nQVTARN000::iTraceable {
 
   private:
     static void* threadMain(void* controller);
-    static void runEntry(iThread& runnable, tStatus& status);
     const char* priorityText(char* buffer, std::size_t size) const;
 
     std::atomic<std::uint32_t> threadId_{0};  // kernel id, published by the thread itself
     iThread* runnable_ = nullptr;             // not owned
-    tEntry entry_ = nullptr;
     pthread_t threadHandle_{};
     bool running_ = false;      // started and not yet joined; owner's thread only
     bool handleValid_ = false;  // threadHandle_ names a thread not yet joined

@@ -20,12 +20,10 @@ void tThreadController::start(iThread* runnable, tStatus& status) {
         status.set(kStatusAlreadyRunning, kComponentMgmt, "tThreadController", __LINE__);
         return;
     }
-    join();  // a thread that ended and was never joined
     if (status.failed()) {
         return;
     }
     runnable_ = runnable;
-    entry_ = &runEntry;
     exitCode_.store(0);
     threadId_.store(0);
     if (runnable == nullptr || pthread_create(&threadHandle_, nullptr, &threadMain, this) != 0) {
@@ -55,15 +53,9 @@ void* tThreadController::threadMain(void* controller) {
     auto* self = static_cast<tThreadController*>(controller);
     self->threadId_.store(GetCurrentThreadId());
     tStatus status;
-    self->entry_(*self->runnable_, status);
+    self->runnable_->run(status);
     self->exitCode_.store(status.code < 0 ? status.code : 0);
     return nullptr;
-}
-
-void tThreadController::runEntry(iThread& runnable, tStatus& status) {
-    tStatus fresh;
-    runnable.run(fresh);
-    status = fresh;
 }
 
 const char* tThreadController::priorityText(char* buffer, std::size_t size) const {

@@ -1,28 +1,20 @@
 #include "platform/tTrace.h"
 
 #include <algorithm>
+#include <charconv>
 #include <chrono>
 #include <cstdarg>
 #include <cstdio>
 #include <cstring>
 
 #include "platform/CurrentThread.h"
+#include "platform/tStatus.h"
 
 namespace nQVTARN000 {
 
 namespace {
 
 constexpr char kOverflowNotice[] = "!!Formatted string exceeds kMaxTraceLine characters!!";
-
-const char* fileNameOnly(const char* path) {
-    const char* name = path;
-    for (const char* p = path; *p != '\0'; ++p) {
-        if (*p == '/' || *p == '\\') {
-            name = p + 1;
-        }
-    }
-    return name;
-}
 
 }  // namespace
 
@@ -33,7 +25,7 @@ tTrace::tTrace(iTraceDestination* destination)
 
 tTrace::~tTrace() {
     flags_ &= ~bit(Flag::enabled);
-    if (lineLocked_) {
+    for (; linesHeld_ > 0; --linesHeld_) {
         lock_.unlock();
     }
 }
@@ -89,22 +81,12 @@ tTrace& tTrace::append(bool value) {
     return append(value ? "true(1)" : "false(0)");
 }
 
-void tTrace::appendUnsigned(std::uint32_t value, unsigned radix, bool negative) {
-    if (radix < 2 || radix > 36) {
-        radix = 10;
-    }
-    char digits[34];
-    std::size_t count = 0;
-    do {
-        digits[count++] = "0123456789abcdefghijklmnopqrstuvwxyz"[value % radix];
-        value /= radix;
-    } while (value != 0);
-    if (negative) {
-        digits[count++] = '-';
-    }
-    while (count > 0) {
-        append(digits[--count]);
-    }
+template <typename Integer>
+void tTrace::appendNumber(Integer value, unsigned radix) {
+    char digits[34];  // 32 binary digits and a sign
+    const int base = radix < 2 || radix > 36 ? 10 : static_cast<int>(radix);
+    const std::to_chars_result end = std::to_chars(digits, digits + sizeof digits, value, base);
+    append(digits, static_cast<std::size_t>(end.ptr - digits));
 }
 
 tTrace& tTrace::append(std::uint8_t value, unsigned radix) {
@@ -114,7 +96,7 @@ tTrace& tTrace::append(std::uint16_t value, unsigned radix) {
     return append(static_cast<std::uint32_t>(value), radix);
 }
 tTrace& tTrace::append(std::uint32_t value, unsigned radix) {
-    appendUnsigned(value, radix, false);
+    appendNumber(value, radix);
     return *this;
 }
 tTrace& tTrace::append(std::int8_t value, unsigned radix) {
@@ -124,10 +106,7 @@ tTrace& tTrace::append(std::int16_t value, unsigned radix) {
     return append(static_cast<std::int32_t>(value), radix);
 }
 tTrace& tTrace::append(std::int32_t value, unsigned radix) {
-    // The magnitude of the smallest value does not fit an int32_t, but does fit a uint32_t.
-    const std::uint32_t magnitude =
-        value < 0 ? 0U - static_cast<std::uint32_t>(value) : static_cast<std::uint32_t>(value);
-    appendUnsigned(magnitude, radix, value < 0);
+    appendNumber(value, radix);
     return *this;
 }
 
@@ -161,8 +140,11 @@ tTrace& tTrace::endLine() {
         suppressed_ = false;
         append('\n');
     }
-    if (lineLocked_) {
-        lineLocked_ = false;
+    // Only the thread that locked the line may end its hold.
+    if (owner_.load() == std::this_thread::get_id() && linesHeld_ > 0) {
+        if (--linesHeld_ == 0) {
+            owner_.store(std::thread::id());
+        }
         lock_.unlock();
     }
     return *this;
@@ -191,7 +173,7 @@ void tTrace::writeHeader(const char* component, std::uint32_t line, const char* 
         field(number);
     }
     if (on(Flag::showFile)) {
-        field(file != nullptr ? fileNameOnly(file) : "");
+        field(file != nullptr ? sourceBaseName(file) : "");
     }
     if (on(Flag::showThread)) {
         std::snprintf(number, sizeof(number), "%lu",
@@ -228,7 +210,8 @@ tTrace& tTrace::beginLine(const char* component, std::uint32_t line, const char*
     }
     if (on(Flag::lockLines)) {
         lock_.lock();
-        lineLocked_ = true;
+        owner_.store(std::this_thread::get_id());
+        ++linesHeld_;
     }
     writeHeader(component, line, file, code);
     if (nesting == kCloseLevel && depth_ > 0) {

@@ -1,9 +1,11 @@
 #ifndef QV_PLATFORM_TTRACE_H
 #define QV_PLATFORM_TTRACE_H
 
+#include <atomic>
 #include <cstddef>
 #include <cstdint>
 #include <mutex>
+#include <thread>
 
 #include "platform/iTraceDestination.h"
 #include "platform/iTraceable.h"
@@ -67,7 +69,8 @@ class tTrace {
     bool appending() const { return on(Flag::enabled) && !suppressed_; }
     void put(char c);
     void flushPiece();
-    void appendUnsigned(std::uint32_t value, unsigned radix, bool negative);
+    template <typename Integer>
+    void appendNumber(Integer value, unsigned radix);
     void writeHeader(const char* component, std::uint32_t line, const char* file,
                      std::int32_t code);
 
@@ -76,8 +79,11 @@ class tTrace {
     bool suppressed_ = false;
     std::uint32_t headerWidth_ = 50;
     std::int32_t depth_ = 0;
-    bool lineLocked_ = false;
-    std::mutex lock_;  // held from beginLine to endLine while lockLines is on
+    // Held from beginLine to endLine while lockLines is on. Recursive: describing an object
+    // may begin a line of its own inside the current one on the same thread.
+    std::recursive_mutex lock_;
+    std::atomic<std::thread::id> owner_{};  // the thread holding lock_, if any
+    std::uint32_t linesHeld_ = 0;           // times owner_ holds lock_; guarded by lock_
     char line_[kMaxPiece + 1] = {};
     std::size_t cursor_ = 0;
 };

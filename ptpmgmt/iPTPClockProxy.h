@@ -4,6 +4,7 @@
 #include <cstdint>
 
 #include "platform/tStatus.h"
+#include "ptp/tPortAddress.h"
 #include "ptp/tPortIdentity.h"
 #include "ptp/tTimestamp.h"
 
@@ -15,6 +16,7 @@ class tParentDataSetTLV;
 class tPortDataSetTLV;
 class tUTCPropertiesTLV;
 class tTraceabilityPropertiesTLV;
+class tClockDescriptionTLV;
 }  // namespace nQVPTP000
 
 namespace nQVPTPMGMT000 {
@@ -37,8 +39,8 @@ class iPTPClockProxy {
     virtual bool isP2PTransparentClock() const = 0;
     virtual bool isE2ETransparentClock() const = 0;
     virtual bool isBoundaryClock() const = 0;
-    // Texts are copied with a terminating zero; a buffer too small records -52012 and is
-    // left untouched.
+    // Texts, cached or fetched, are copied with a terminating zero; a buffer too small records
+    // -52012 and is left untouched.
     virtual void getPhysicalLayerProtocol(char* buffer, std::uint16_t size,
                                           tStatus& status) const = 0;
     virtual std::uint16_t getPhysicalAddressLength() const = 0;
@@ -56,7 +58,6 @@ class iPTPClockProxy {
     virtual void getNullManagement(tStatus& status) = 0;
     virtual void setNullManagement(tStatus& status) = 0;
     virtual void commandNullManagement(tStatus& status) = 0;
-    // Copies at most `size` octets; a terminating zero only when there is room for it.
     virtual void getUserDescription(char* buffer, std::uint16_t size, tStatus& status) = 0;
     virtual void setUserDescription(const char* text, tStatus& status) = 0;
     virtual void saveInNonVolatileStorage(tStatus& status) = 0;
@@ -105,6 +106,14 @@ class iPTPClockProxy {
                                            tStatus& status) = 0;
     // The 10-octet clock key of the target port.
     virtual const std::uint8_t* getClockKey() = 0;
+
+    // The domain of every request; follows a successful setDomain.
+    virtual std::uint8_t getDomainNumber() const = 0;
+    // A copy of the protocolAddress of the cached clock description.
+    virtual nQVPTP000::tPortAddress getProtocolAddress() const = 0;
+    // Asks the port for its clock description again; on success it becomes the cached one.
+    // On failure the result holds the defaults and the cache is unchanged.
+    virtual nQVPTP000::tClockDescriptionTLV refreshClockDescription(tStatus& status) = 0;
 };
 
 }  // namespace nQVPTPMGMT000

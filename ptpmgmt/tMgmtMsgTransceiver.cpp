@@ -4,6 +4,7 @@
 #include <new>
 #include <thread>
 
+#include "platform/tStatusReason.h"
 #include "ptp/tMessageHeader.h"
 #include "ptp/tPTPMessageFactory.h"
 #include "ptp/tProtocolDataUnit.h"
@@ -18,8 +19,10 @@ using nQVPTP000::tPTPMessage;
 namespace {
 
 constexpr std::uint32_t kManagementMessageType = 13;
-// After a transport error the loop pauses this long, so that a failure that repeats at
-// once (a closed socket) does not spin the processor.
+// After a failure of the socket itself the loop pauses this long, so that a failure that
+// repeats at once (a closed socket) does not spin the processor. A bad datagram earns no
+// pause: pausing for each would let a flood of them pile up in the socket's queue ahead of
+// the answers.
 constexpr auto kErrorBackOff = std::chrono::milliseconds(10);
 
 }  // namespace
@@ -143,32 +146,29 @@ std::unique_ptr<tManagementMessage> tMgmtMsgTransceiver::takeResponse(std::uint1
 }
 
 void tMgmtMsgTransceiver::cancelRequest(std::uint16_t sequenceId, tStatus& status) {
-    if (status.failed()) {
-        return;
-    }
-    nQVTARN000::tMutex::tGuard guard(pendingLock_, status);
-    if (status.succeeded()) {
-        auto found = std::find(pendingSequenceIds_.begin(), pendingSequenceIds_.end(), sequenceId);
-        if (found != pendingSequenceIds_.end()) {
-            pendingSequenceIds_.erase(found);
-        }
-    }
+    forget(sequenceId, false, status);
 }
 
 void tMgmtMsgTransceiver::retireRequest(std::uint16_t sequenceId, tStatus& status) {
+    forget(sequenceId, true, status);
+}
+
+void tMgmtMsgTransceiver::forget(std::uint16_t sequenceId, bool storedToo, tStatus& status) {
     if (status.failed()) {
         return;
     }
     // Under pendingLock_ the receive thread cannot be between matching an answer to this id
     // and storing it, so nothing for it can be stored after this.
     nQVTARN000::tMutex::tGuard pending(pendingLock_, status);
-    auto found = std::find(pendingSequenceIds_.begin(), pendingSequenceIds_.end(), sequenceId);
-    if (found != pendingSequenceIds_.end()) {
-        pendingSequenceIds_.erase(found);
+    if (status.failed()) {
+        return;
     }
-    nQVTARN000::tMutex::tGuard responses(responsesLock_, status);
-    if (status.succeeded()) {
-        responses_.erase(sequenceId);
+    std::erase(pendingSequenceIds_, sequenceId);
+    if (storedToo) {
+        nQVTARN000::tMutex::tGuard responses(responsesLock_, status);
+        if (status.succeeded()) {
+            responses_.erase(sequenceId);
+        }
     }
 }
 
@@ -253,7 +253,10 @@ void tMgmtMsgTransceiver::run(tStatus& status) {
         unit.reset();
         transport_->receive(unit, status);
         if (status.failed()) {
-            if (!stopRequested_.load()) {
+            if (tStatusReason::kindOf(status) == tStatusReason::tKind::kBadDatagram) {
+                badDatagrams_.fetch_add(1);
+                status.reset();
+            } else if (!stopRequested_.load()) {
                 noteReceiveError(status);
             }
             continue;
@@ -262,6 +265,7 @@ void tMgmtMsgTransceiver::run(tStatus& status) {
         std::unique_ptr<tPTPMessage> message =
             nQVPTP000::tPTPMessageFactory::createMessage(unit, decodeStatus);
         if (decodeStatus.failed() || !message) {
+            badDatagrams_.fetch_add(1);
             continue;
         }
         const nQVPTP000::tMessageHeader* header = message->getHeader();

@@ -66,6 +66,8 @@ class tMgmtMsgTransceiver final : public nQVTARN000::iThread {
     // here and carries on delivering answers.
     std::uint64_t receiveErrorCount() const { return receiveErrors_.load(); }
     tStatus lastReceiveError() const;
+    // Datagrams dropped as too large or undecodable: counted, not paused for.
+    std::uint64_t badDatagramCount() const { return badDatagrams_.load(); }
     bool isRunning() const { return running_.load(); }
     // Answers stored and not yet taken (for tests that watch the store stay bounded).
     std::size_t storedResponseCount() const;
@@ -74,6 +76,8 @@ class tMgmtMsgTransceiver final : public nQVTARN000::iThread {
     bool matches(const nQVPTP000::tPTPMessage& message, tStatus& status) const;
     void store(std::unique_ptr<nQVPTP000::tManagementMessage> message, tStatus& status);
     void noteReceiveError(tStatus& threadStatus);
+    // Drops the id from the awaited ones and, when `storedToo`, its stored answers.
+    void forget(std::uint16_t sequenceId, bool storedToo, tStatus& status);
 
     std::uint32_t nextSequenceId_ = 0;         // guarded by sendLock_
     nQVPTP000::iPTPPortMessaging* transport_;  // not owned
@@ -95,6 +99,7 @@ class tMgmtMsgTransceiver final : public nQVTARN000::iThread {
     std::uint64_t arrivals_ = 0;  // guarded by arrivalLock_
 
     std::atomic<std::uint64_t> receiveErrors_{0};
+    std::atomic<std::uint64_t> badDatagrams_{0};
     mutable std::mutex receiveErrorLock_;
     tStatus lastReceiveError_;  // guarded by receiveErrorLock_
 };

@@ -4,6 +4,7 @@
 #include <cstring>
 #include <new>
 
+#include "platform/tStatusReason.h"
 #include "ptp/TLVs/tAnnounceReceiptTimeoutTLV.h"
 #include "ptp/TLVs/tClockAccuracyTLV.h"
 #include "ptp/TLVs/tDelayMechanismTLV.h"
@@ -30,6 +31,23 @@ namespace nQVPTPMGMT000 {
 
 using namespace nQVPTP000;
 using tAction = tManagementMessagePayload::tActionField;
+
+namespace {
+
+// Copies a text with its terminating zero, or records -52012 when it does not fit: every
+// text reader of the proxy leaves a caller's buffer either terminated or untouched.
+void copyTerminated(const tPTPText& text, char* buffer, std::uint16_t size, tStatus& status) {
+    if (text.getLengthField() + 1U > size) {
+        QV_STATUS_SET(status, kStatusNoData, kComponentMgmt);
+        return;
+    }
+    if (text.getLengthField() != 0) {
+        std::memcpy(buffer, text.getTextField(), text.getLengthField());
+    }
+    buffer[text.getLengthField()] = '\0';
+}
+
+}  // namespace
 
 tPTPClockProxy::tPTPClockProxy(tPTPMgmtNode* node, const tClockKey& key, tDescription description,
                                tStatus& status)
@@ -98,9 +116,11 @@ const TLV* tPTPClockProxy::payloadOf(tManagementMessage* answer, tStatus& status
     if (answer == nullptr || status.failed()) {
         return nullptr;
     }
-    const TLV* tlv = dynamic_cast<const TLV*>(answer->getPayload(status));
-    if (tlv == nullptr) {
-        QV_STATUS_SET(status, kStatusNoData, kComponentMgmt);
+    const tManagementMessagePayload* payload = answer->getPayload(status);
+    const TLV* tlv = dynamic_cast<const TLV*>(payload);
+    if (tlv == nullptr && QV_STATUS_SET(status, kStatusNoData, kComponentMgmt)) {
+        tStatusReason::wrongAnswer(status, answer->getActionField(),
+                                   payload != nullptr ? payload->getManagementId() : 0);
     }
     return tlv;
 }
@@ -170,14 +190,7 @@ void tPTPClockProxy::getUserDescription(char* buffer, std::uint16_t size, tStatu
         return;
     }
     try {
-        const tPTPText text = tlv->getUserDescription();
-        const std::size_t count = std::min<std::size_t>(text.getLengthField(), size);
-        if (count != 0) {
-            std::memcpy(buffer, text.getTextField(), count);
-        }
-        if (count < size) {
-            buffer[count] = '\0';
-        }
+        copyTerminated(tlv->getUserDescription(), buffer, size, status);
     } catch (const std::bad_alloc&) {
         QV_STATUS_SET(status, kStatusNoMemory, kComponentMgmt);
     }
@@ -341,11 +354,11 @@ bool tPTPClockProxy::isOrdinaryClock() const {
                            false);
 }
 bool tPTPClockProxy::isP2PTransparentClock() const {
-    return readDescription([](const tClockDescriptionTLV& d) { return d.getP2pTransparentClock(); },
+    return readDescription([](const tClockDescriptionTLV& d) { return d.getP2PTransparentClock(); },
                            false);
 }
 bool tPTPClockProxy::isE2ETransparentClock() const {
-    return readDescription([](const tClockDescriptionTLV& d) { return d.getE2eTransparentClock(); },
+    return readDescription([](const tClockDescriptionTLV& d) { return d.getE2ETransparentClock(); },
                            false);
 }
 bool tPTPClockProxy::isBoundaryClock() const {
@@ -362,7 +375,6 @@ tPortAddress tPTPClockProxy::getProtocolAddress() const {
                            tPortAddress());
 }
 
-// Copies a text with its terminating zero, or records -52012 when it does not fit.
 void tPTPClockProxy::copyText(tPTPText (tClockDescriptionTLV::*getter)() const, char* buffer,
                               std::uint16_t size, tStatus& status) const {
     if (status.failed()) {
@@ -372,15 +384,7 @@ void tPTPClockProxy::copyText(tPTPText (tClockDescriptionTLV::*getter)() const, 
     try {
         described = readDescription(
             [&](const tClockDescriptionTLV& d) {
-                const tPTPText text = (d.*getter)();
-                if (text.getLengthField() + 1U > size) {
-                    QV_STATUS_SET(status, kStatusNoData, kComponentMgmt);
-                    return true;
-                }
-                if (text.getLengthField() != 0) {
-                    std::memcpy(buffer, text.getTextField(), text.getLengthField());
-                }
-                buffer[text.getLengthField()] = '\0';
+                copyTerminated((d.*getter)(), buffer, size, status);
                 return true;
             },
             false);

@@ -103,15 +103,12 @@ class tPTPClockProxy final : public iPTPClockProxy {
                                    tStatus& status) override;
     const std::uint8_t* getClockKey() override;
 
-    // A copy of the protocolAddress of the cached clock description.
-    nQVPTP000::tPortAddress getProtocolAddress() const;
-    // Asks the port for its clock description again; on success it becomes the cached one.
-    // On failure the result holds the defaults and the cache is unchanged.
-    nQVPTP000::tClockDescriptionTLV refreshClockDescription(tStatus& status);
+    std::uint8_t getDomainNumber() const override { return domainNumber_.load(); }
+    nQVPTP000::tPortAddress getProtocolAddress() const override;
+    nQVPTP000::tClockDescriptionTLV refreshClockDescription(tStatus& status) override;
 
     // Used by the node when a later discovery brings a newer description of this port.
     void setCachedDescription(tDescription description);
-    std::uint8_t getDomainNumber() const { return domainNumber_.load(); }
     // Only the client's own tests call this, to keep failing exchanges short; in use every
     // exchange waits kTimeoutMs.
     void setExchangeTimeout(std::uint16_t timeoutMs) { timeout_ = timeoutMs; }

@@ -4,8 +4,11 @@
 #include <new>
 #include <thread>
 
+#include "platform/tStatusReason.h"
 #include "ptp/TLVs/tClockDescriptionTLV.h"
+#include "ptp/TLVs/tManagementErrorStatusTLV.h"
 #include "ptp/tMessageHeader.h"
+#include "ptpmgmt/mgmtTrace.h"
 #include "ptpmgmt/tPTPClockProxy.h"
 
 namespace nQVPTPMGMT000 {
@@ -157,20 +160,21 @@ iPTPClockProxy* tPTPMgmtNode::findClock(const tClockKey& key, tStatus& status) {
     return status.succeeded() ? found->second.get() : nullptr;
 }
 
+// By identity, not by the proxy's key: after assign that key names another port, whose
+// proxy must stay.
 void tPTPMgmtNode::removeClock(iPTPClockProxy* proxy, tStatus& status) {
     if (status.failed() || proxy == nullptr) {
         return;
     }
     tMutex::tGuard guard(clockListLock_, status);
-    tClockKey key{};
-    std::copy_n(proxy->getClockKey(), key.size(), key.begin());
-    auto found = clocks_.find(key);
+    auto found = std::find_if(clocks_.begin(), clocks_.end(),
+                              [proxy](const auto& entry) { return entry.second.get() == proxy; });
     if (status.succeeded() && found == clocks_.end()) {
         QV_STATUS_SET(status, kStatusNoData, kComponentMgmt);
     }
     if (status.succeeded()) {
+        descriptions_.erase(found->first);
         clocks_.erase(found);
-        descriptions_.erase(key);
         clockCount_.store(static_cast<std::uint16_t>(clocks_.size()));
     }
 }
@@ -201,7 +205,30 @@ std::unique_ptr<tManagementMessage> tPTPMgmtNode::sendAndAwait(
     std::unique_ptr<tManagementMessage> answer = await(sequenceId, request, timeoutMs, status);
     tStatus scratch;
     transceiver_.retireRequest(sequenceId, scratch);
+    if (tStatusReason::kindOf(status) != tStatusReason::tKind::kNone) {
+        traceFailure(request, status);
+    }
     return answer;
+}
+
+// One line for each exchange that failed for a reason the clock gave or withheld.
+void tPTPMgmtNode::traceFailure(const tManagementMessage& request, const tStatus& status) const {
+    try {
+        tStatus scratch;
+        const tManagementMessagePayload* asked = request.getPayload(scratch);
+        const std::string reason = tStatusReason::describe(status);
+        const nQVPTP000::tPortIdentity target = request.getTargetPortIdentity();
+        mgmtTrace()
+            .beginLine(kComponentMgmt, __LINE__, sourceBaseName(__FILE__), status.code, 0)
+            .appendFormatted("exchange %u, managementId 0x%04X, with ",
+                             request.getHeader()->getSequenceId(),
+                             asked != nullptr ? asked->getManagementId() : 0U)
+            .append(target.getClockIdentity())
+            .appendFormatted(":%u failed: %s", target.getPortNumber(), reason.c_str())
+            .endLine();
+    } catch (const std::bad_alloc&) {
+        // The line is a diagnostic: without memory for it the failure stands as recorded.
+    }
 }
 
 // Waits for the first answer to `sequenceId`: the caller wakes as soon as one is stored,
@@ -210,7 +237,9 @@ std::unique_ptr<tManagementMessage> tPTPMgmtNode::await(std::uint16_t sequenceId
                                                         const tManagementMessage& request,
                                                         std::uint16_t timeoutMs, tStatus& status) {
     if (timeoutMs == 0) {
-        QV_STATUS_SET(status, kStatusNoData, kComponentMgmt);
+        if (QV_STATUS_SET(status, kStatusNoData, kComponentMgmt)) {
+            tStatusReason::noAnswer(status, 0);
+        }
         return nullptr;
     }
     const std::uint32_t steps = (timeoutMs + kPollMilliseconds - 1) / kPollMilliseconds;
@@ -223,8 +252,9 @@ std::unique_ptr<tManagementMessage> tPTPMgmtNode::await(std::uint16_t sequenceId
             check(request, answer, status);
             return answer;
         }
-        if (status.succeeded() && tMgmtMsgTransceiver::tClock::now() >= deadline) {
-            QV_STATUS_SET(status, kStatusNoData, kComponentMgmt);
+        if (status.succeeded() && tMgmtMsgTransceiver::tClock::now() >= deadline &&
+            QV_STATUS_SET(status, kStatusNoData, kComponentMgmt)) {
+            tStatusReason::noAnswer(status, timeoutMs);
         }
         if (status.succeeded()) {
             transceiver_.awaitArrival(seen, deadline);
@@ -249,9 +279,20 @@ void tPTPMgmtNode::check(const tManagementMessage& request,
          reply == tManagementMessagePayload::kResponse) ||
         (action == tManagementMessagePayload::kCommand &&
          reply == tManagementMessagePayload::kAcknowledge);
-    if (payload->getTlvType() == nQVPTP000::tTLV::kManagementErrorStatus || !pairMatches ||
-        payload->getManagementId() != asked->getManagementId()) {
-        QV_STATUS_SET(status, kStatusNoData, kComponentMgmt);
+    if (payload->getTlvType() == nQVPTP000::tTLV::kManagementErrorStatus) {
+        if (QV_STATUS_SET(status, kStatusNoData, kComponentMgmt)) {
+            // The clock's own words: they stay with the status after the answer is gone.
+            const auto* refusal =
+                dynamic_cast<const nQVPTP000::tManagementErrorStatusTLV*>(payload);
+            tStatusReason::refused(
+                status, refusal != nullptr ? refusal->getManagementErrorId() : 0,
+                refusal != nullptr ? refusal->getDisplayData().view() : std::string_view());
+        }
+        answer.reset();
+    } else if (!pairMatches || payload->getManagementId() != asked->getManagementId()) {
+        if (QV_STATUS_SET(status, kStatusNoData, kComponentMgmt)) {
+            tStatusReason::wrongAnswer(status, reply, payload->getManagementId());
+        }
         answer.reset();
     }
 }

@@ -48,7 +48,8 @@ class tPTPMgmtNode final : public iPTPMgmtNode {
     // `target` in `domainNumber` and returns the answer, owned by the caller, once it has
     // passed the checks: no error status, RESPONSE to GET or SET and ACKNOWLEDGE to COMMAND,
     // the same management id. Fails with -52012 when no answer came within the time-out
-    // (ceil(timeoutMs / 50) steps of 50 ms) or the answer failed a check.
+    // (ceil(timeoutMs / 50) steps of 50 ms) or the answer failed a check; the status's
+    // extension words then say which (tStatusReason), and a trace line says it too.
     std::unique_ptr<nQVPTP000::tManagementMessage> sendAndAwait(
         const nQVPTP000::tPortIdentity& target,
         std::unique_ptr<nQVPTP000::tManagementMessagePayload> payload, std::uint32_t actionField,
@@ -69,6 +70,7 @@ class tPTPMgmtNode final : public iPTPMgmtNode {
         std::uint16_t timeoutMs, tStatus& status);
     void check(const nQVPTP000::tManagementMessage& request,
                std::unique_ptr<nQVPTP000::tManagementMessage>& response, tStatus& status);
+    void traceFailure(const nQVPTP000::tManagementMessage& request, const tStatus& status) const;
 
     const nQVPTP000::tPortIdentity portIdentity_;
     nQVTARN000::tMutex clockListLock_;

@@ -50,8 +50,8 @@ class tClockDescriptionTLV final : public tDataFieldTLV<tClockDescriptionTLV> {
 
     bool getManagementNode() const { return managementNode_; }
     bool getOrdinaryClock() const { return ordinaryClock_; }
-    bool getP2pTransparentClock() const { return p2pTransparentClock_; }
-    bool getE2eTransparentClock() const { return e2eTransparentClock_; }
+    bool getP2PTransparentClock() const { return p2pTransparentClock_; }
+    bool getE2ETransparentClock() const { return e2eTransparentClock_; }
     bool getBoundaryClock() const { return boundaryClock_; }
     tPTPText getPhysicalLayerProtocol() const { return physicalLayerProtocol_; }
     std::uint16_t getPhysicalAddressLength() const { return physicalAddressLength_; }

@@ -9,6 +9,8 @@
 #include <cerrno>
 #include <cstring>
 
+#include "platform/tStatusReason.h"
+
 namespace nQVPTP000 {
 
 namespace {
@@ -206,8 +208,15 @@ void tUDPNetworkInterface::receive(tProtocolDataUnit& unit, tStatus& status) {
             }
             continue;
         }
-        if (length < 0 || static_cast<std::size_t>(length) > kMaxDatagram) {
+        if (length < 0) {
             QV_STATUS_SET(status, kStatusSocketError, kComponentCodec);
+            return;
+        }
+        if (static_cast<std::size_t>(length) > kMaxDatagram) {
+            // Consumed already; the socket is sound, so the caller may read on at once.
+            if (QV_STATUS_SET(status, kStatusSocketError, kComponentCodec)) {
+                tStatusReason::badDatagram(status, static_cast<std::uint64_t>(length));
+            }
             return;
         }
         if (length > 0) {
@@ -218,8 +227,9 @@ void tUDPNetworkInterface::receive(tProtocolDataUnit& unit, tStatus& status) {
     }
 }
 
-// Waits in steps of half a second until a receive socket is readable (the event socket
-// wins when both are), an abort is requested or the interface is closed.
+// Waits in steps of half a second until a receive socket is readable, an abort is requested
+// or the interface is closed. When both sockets are readable they take turns: a flood on
+// one port must not hold back the answers waiting on the other.
 bool tUDPNetworkInterface::awaitDatagram(int& readySocket, tStatus& status) {
     const int event = eventSocket_.load();
     const int general = generalSocket_.load();
@@ -247,7 +257,10 @@ bool tUDPNetworkInterface::awaitDatagram(int& readySocket, tStatus& status) {
             drainWake();
         }
         if (waiting[0].revents != 0 || waiting[1].revents != 0) {
-            readySocket = waiting[0].revents != 0 ? event : general;
+            const bool both = waiting[0].revents != 0 && waiting[1].revents != 0;
+            readySocket = both ? (lastSocket_ == event ? general : event)
+                               : (waiting[0].revents != 0 ? event : general);
+            lastSocket_ = readySocket;
             return true;
         }
     }

@@ -47,7 +47,8 @@ class tUDPNetworkInterface final : public iPTPPortMessaging {
     // In compatibility mode the unit is first padded with zero octets to 124 octets.
     void sendEventMessage(tProtocolDataUnit& unit, tStatus& status) override;
     void sendGeneralMessage(tProtocolDataUnit& unit, tStatus& status) override;
-    // A datagram longer than 1024 octets is consumed and gives -52003.
+    // A datagram longer than 1024 octets is consumed and gives -52003 with the reason
+    // tStatusReason::tKind::kBadDatagram: unlike a failing socket, reading may go on at once.
     void receive(tProtocolDataUnit& unit, tStatus& status) override;
     void abortReceive(tStatus& status) override;
     tPortAddress getPortAddress() override;
@@ -75,6 +76,7 @@ class tUDPNetworkInterface final : public iPTPPortMessaging {
     std::atomic<bool> padEventMessages_{false};
     // An eventfd (a loopback socket on Windows) that abortReceive and close signal.
     std::atomic<int> wakeEvent_{-1};
+    int lastSocket_ = -1;  // the socket read last; the receiving thread's only
 
     std::mutex receiveLock_;  // guards activeReceives_ and closing_
     std::condition_variable receiveIdle_;

@@ -5,6 +5,7 @@
 #include <cstring>
 #include <mutex>
 
+#include "platform/tStatusReason.h"
 #include "ptp/transport/tUDPNetworkInterface.h"
 
 namespace nQVPTP000 {
@@ -17,6 +18,8 @@ namespace {
 
 constexpr std::uint8_t kCompatibilityBit = 0x10;
 constexpr std::uint8_t kAnnounceType = 0xB;
+// Room for any UDP datagram, so that an oversized one is read whole and its length known.
+constexpr std::size_t kLargestDatagram = 65536;
 
 SOCKET handleOf(int stored) {
     return static_cast<SOCKET>(static_cast<std::intptr_t>(stored));
@@ -239,9 +242,8 @@ void tUDPNetworkInterface::receive(tProtocolDataUnit& unit, tStatus& status) {
     if (!awaitDatagram(readySocket, status)) {
         return;
     }
-    char buffer[kMaxDatagram];
+    static thread_local char buffer[kLargestDatagram];
     for (;;) {
-        // A datagram longer than the buffer fails with WSAEMSGSIZE and is consumed.
         const int length = recv(handleOf(readySocket), buffer, sizeof(buffer), 0);
         const int error = length == SOCKET_ERROR ? WSAGetLastError() : 0;
         if (reportAbort(status)) {
@@ -257,6 +259,13 @@ void tUDPNetworkInterface::receive(tProtocolDataUnit& unit, tStatus& status) {
             QV_STATUS_SET(status, kStatusSocketError, kComponentCodec);
             return;
         }
+        if (static_cast<std::size_t>(length) > kMaxDatagram) {
+            // Consumed already; the socket is sound, so the caller may read on at once.
+            if (QV_STATUS_SET(status, kStatusSocketError, kComponentCodec)) {
+                tStatusReason::badDatagram(status, static_cast<std::uint64_t>(length));
+            }
+            return;
+        }
         if (length > 0) {
             noteCompatibility(static_cast<std::uint8_t>(buffer[0]),
                               readySocket == eventSocket_.load());
@@ -267,8 +276,9 @@ void tUDPNetworkInterface::receive(tProtocolDataUnit& unit, tStatus& status) {
     }
 }
 
-// Waits in steps of half a second until a receive socket is readable (the event socket
-// wins when both are), an abort is requested or the interface is closed.
+// Waits in steps of half a second until a receive socket is readable, an abort is requested
+// or the interface is closed. When both sockets are readable they take turns: a flood on
+// one port must not hold back the answers waiting on the other.
 bool tUDPNetworkInterface::awaitDatagram(int& readySocket, tStatus& status) {
     const int event = eventSocket_.load();
     const int general = generalSocket_.load();
@@ -302,8 +312,11 @@ bool tUDPNetworkInterface::awaitDatagram(int& readySocket, tStatus& status) {
             drainWake();
         }
         const bool eventReady = FD_ISSET(handleOf(event), &readable) != 0;
-        if (eventReady || FD_ISSET(handleOf(general), &readable)) {
-            readySocket = eventReady ? event : general;
+        const bool generalReady = FD_ISSET(handleOf(general), &readable) != 0;
+        if (eventReady || generalReady) {
+            readySocket = eventReady && generalReady ? (lastSocket_ == event ? general : event)
+                                                     : (eventReady ? event : general);
+            lastSocket_ = readySocket;
             return true;
         }
     }

@@ -232,8 +232,8 @@ void expectDescriptions(const Reading& r) {
         const tValues pmc = r.pmc("CLOCK_DESCRIPTION");
         const long clockType =
             (ours.getOrdinaryClock() ? 0x8000 : 0) | (ours.getBoundaryClock() ? 0x4000 : 0) |
-            (ours.getP2pTransparentClock() ? 0x2000 : 0) |
-            (ours.getE2eTransparentClock() ? 0x1000 : 0) | (ours.getManagementNode() ? 0x0800 : 0);
+            (ours.getP2PTransparentClock() ? 0x2000 : 0) |
+            (ours.getE2ETransparentClock() ? 0x1000 : 0) | (ours.getManagementNode() ? 0x0800 : 0);
         EXPECT_EQ(clockType, number(pmc, "clockType"));
         EXPECT_EQ(textOf(ours.getPhysicalLayerProtocol()), pmc.at("physicalLayerProtocol"));
         EXPECT_EQ(octetText(ours.getPhysicalAddress()), pmc.at("physicalAddress"));

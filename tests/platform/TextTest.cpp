@@ -94,8 +94,9 @@ TEST(CodePageTest, MalformedInputThrowsWinError) {
     const char16_t loneSurrogate[] = {u'a', 0xD800, u'b'};
     EXPECT_THROW(qv::dsc::WideToAnsi(std::u16string_view(loneSurrogate, 3), "cp932"), WinError);
     // 0x81 opens a double-byte code that never comes.
-    EXPECT_THROW(qv::dsc::AnsiToWide("ab\x81", "cp932"), WinError);
-    EXPECT_THROW(qv::dsc::AnsiToWide("\xC3", "US-ASCII"), WinError);
+    constexpr auto strict = qv::dsc::CodePage::tInvalidText::kThrow;
+    EXPECT_THROW(qv::dsc::AnsiToWide("ab\x81", "cp932", strict), WinError);
+    EXPECT_THROW(qv::dsc::AnsiToWide("\xC3", "US-ASCII", strict), WinError);
 }
 
 TEST(CodePageTest, EmptyTextGivesEmptyResult) {

@@ -348,18 +348,16 @@ TEST_F(tPTPClockProxyOperationsTest, UserDescriptionIsWrittenAndRead) {
     ASSERT_TRUE(status_.succeeded());
     expectLastRequest(0x0002, kSet);
     ASSERT_EQ(managed().userDescription.getLengthField(), 3);
-    // Exactly the buffer's size: no room for a terminating zero.
-    char three[4] = {'x', 'x', 'x', 'x'};
-    proxy().getUserDescription(three, 3, status_);
-    expectLastRequest(0x0002, kGet);
-    EXPECT_EQ(std::string(three, 4), "abcx");
     char four[5] = {'x', 'x', 'x', 'x', 'x'};
     proxy().getUserDescription(four, 4, status_);
+    expectLastRequest(0x0002, kGet);
     EXPECT_EQ(std::string(four, 5), std::string("abc\0x", 5));
-    char two[3] = {'x', 'x', 'x'};
-    proxy().getUserDescription(two, 2, status_);
-    EXPECT_EQ(std::string(two, 3), "abx");
     EXPECT_TRUE(status_.succeeded());
+    // No room for the terminating zero: refused like the cached texts, buffer untouched.
+    char three[4] = {'x', 'x', 'x', 'x'};
+    proxy().getUserDescription(three, 3, status_);
+    EXPECT_EQ(status_.code, kStatusNoData);
+    EXPECT_EQ(std::string(three, 4), "xxxx");
 }
 
 TEST_F(tPTPClockProxyOperationsTest, ATooLongUserDescriptionIsNotSent) {

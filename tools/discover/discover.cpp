@@ -33,7 +33,7 @@ void printItemName(const tPortIdentity& port) {
     std::printf(":%u\n", port.getPortNumber());
 }
 
-void printClock(tPTPClockProxy& proxy) {
+void printClock(iPTPClockProxy& proxy) {
     printItemName(proxy.getPortIdentity());
     char text[256];
     tStatus status;
@@ -65,8 +65,7 @@ void printClock(tPTPClockProxy& proxy) {
     }
 
     status.reset();
-    proxy.getUserDescription(text, sizeof text - 1, status);
-    text[sizeof text - 1] = '\0';
+    proxy.getUserDescription(text, sizeof text, status);
     std::printf("  userDescription \"%s\"\n", status.succeeded() ? text : "?");
 }
 
@@ -93,7 +92,7 @@ int main(int argc, char** argv) {
     node.copyClockProxies(proxies.data(), static_cast<std::uint16_t>(proxies.size()), status);
     std::printf("%zu clock port(s) found in domains 0 to 3\n", proxies.size());
     for (iPTPClockProxy* proxy : proxies) {
-        printClock(static_cast<tPTPClockProxy&>(*proxy));
+        printClock(*proxy);
     }
     node.close(status);
     return status.succeeded() ? 0 : 1;

@@ -7,6 +7,7 @@
 #include <cstdlib>
 
 #include "platform/BStr.h"
+#include "platform/CodePage.h"
 #include "platform/LocalDateTime.h"
 #include "platform/OutOfRange.h"
 #include "platform/TaskMemory.h"
@@ -76,4 +77,23 @@ TEST(LocalDateTimeWin32Test, LocalTimeRoundTripsAndTheRunTimesLimitsAreOutOfRang
     qv::dsc::CalendarTime distant = noon;
     distant.yearsSince1900 = 10000 - 1900;
     EXPECT_THROW(qv::dsc::LocalDateTime::toAbsTime(distant), qv::dsc::exception::OutOfRange);
+}
+
+TEST(CodePageWin32Test, InvalidNarrowTextBecomesReplacementsUnlessStrict) {
+    // The named sets behave as on every platform; "" is the system's ANSI code page here.
+    const struct {
+        const char* narrow;
+        const char* locale;
+        std::u16string wide;
+    } cases[] = {
+        {"caf\xC3\xA9", "US-ASCII", u"caf\uFFFD\uFFFD"},
+        {"a\x81 b", "cp932", u"a\uFFFD b"},
+        {"ab\x81", "cp932", u"ab\uFFFD"},
+    };
+    for (const auto& c : cases) {
+        EXPECT_EQ(qv::dsc::AnsiToWide(c.narrow, c.locale), c.wide) << c.narrow;
+        EXPECT_THROW(
+            qv::dsc::AnsiToWide(c.narrow, c.locale, qv::dsc::CodePage::tInvalidText::kThrow),
+            WinError);
+    }
 }
