@@ -1,0 +1,191 @@
+#include "corbel/PropertyValue.h"
+
+#include <charconv>
+#include <cstdio>
+#include <vector>
+
+#include "corbel/ComPtr.h"
+#include "corbel/UtcTime.h"
+#include "corbel/WideText.h"
+
+namespace corbel {
+
+namespace {
+
+std::vector<kxSysAttributeTagID> tagsOf(IkxSysPropertyBag& bag) {
+    std::vector<kxSysAttributeTagID> tags;
+    ComPtr<IkxSysEnumPropertyTag> enumerator;
+    if (FAILED(bag.EnumerateTags(enumerator.out())) || !enumerator) {
+        return tags;
+    }
+    kxSysAttributeTagID batch[32];
+    ULONG fetched = 0;
+    while (SUCCEEDED(enumerator->Next(32, batch, &fetched)) && fetched > 0) {
+        tags.insert(tags.end(), batch, batch + fetched);
+        fetched = 0;
+    }
+    return tags;
+}
+
+template <typename Value, typename Getter>
+std::optional<PropertyValue> get(Getter getter) {
+    Value value{};
+    return SUCCEEDED(getter(&value)) ? std::optional<PropertyValue>(value) : std::nullopt;
+}
+
+std::optional<PropertyValue> readTag(IkxSysPropertyBag& bag, IkxSysPropertyBag2* bag2,
+                                     kxSysAttributeTagID tag) {
+    ULONG type = 0;
+    if (FAILED(bag.GetTagType(tag, &type))) {
+        return std::nullopt;
+    }
+    switch (type) {
+        case kxSysPropertyTypeBool: {
+            BOOL flag = 0;
+            return SUCCEEDED(bag.GetBool(tag, &flag)) ? std::optional<PropertyValue>(flag != 0)
+                                                      : std::nullopt;
+        }
+        case kxSysPropertyTypeLong:
+            return get<std::int32_t>([&](LONG* out) { return bag.GetLong(tag, out); });
+        case kxSysPropertyTypeULong:
+            return get<std::uint32_t>([&](ULONG* out) { return bag.GetULong(tag, out); });
+        case kxSysPropertyTypeDouble:
+            return get<double>([&](double* out) { return bag.GetDouble(tag, out); });
+        case kxSysPropertyTypeGUID:
+            return get<GUID>([&](GUID* out) { return bag.GetGUID(tag, out); });
+        case kxSysPropertyTypeString: {
+            OwnedBstr text;
+            return SUCCEEDED(bag.GetString(tag, text.out()))
+                       ? std::optional<PropertyValue>(text.utf8())
+                       : std::nullopt;
+        }
+        case kxSysPropertyTypeTimestamp:
+            if (bag2 == nullptr) {
+                return std::nullopt;
+            }
+            return get<kxSysAttrTimestampUTC>(
+                [&](kxSysAttrTimestampUTC* out) { return bag2->GetTimestamp(tag, out); });
+        default:
+            return std::nullopt;
+    }
+}
+
+std::string doubleText(double value) {
+    char text[32];
+    const auto end = std::to_chars(text, text + sizeof text, value).ptr;
+    return std::string(text, end);
+}
+
+template <typename Number>
+std::optional<PropertyValue> parseNumber(std::string_view text) {
+    Number number{};
+    const char* end = text.data() + text.size();
+    const auto parsed = std::from_chars(text.data(), end, number);
+    if (text.empty() || parsed.ec != std::errc() || parsed.ptr != end) {
+        return std::nullopt;
+    }
+    return number;
+}
+
+std::optional<PropertyValue> parseBool(std::string_view text) {
+    if (text == "true" || text == "1") {
+        return true;
+    }
+    if (text == "false" || text == "0") {
+        return false;
+    }
+    return std::nullopt;
+}
+
+}  // namespace
+
+PropertyValues readBag(IkxSysPropertyBag& bag) {
+    // Timestamps are read through the second interface only.
+    const auto bag2 = queryInterface<IkxSysPropertyBag2>(bag, IID_IkxSysPropertyBag2);
+    PropertyValues values;
+    for (const kxSysAttributeTagID tag : tagsOf(bag)) {
+        if (auto value = readTag(bag, bag2.get(), tag)) {
+            values.insert_or_assign(tag, std::move(*value));
+        }
+    }
+    return values;
+}
+
+std::string guidText(const GUID& guid) {
+    char text[40];
+    std::snprintf(text, sizeof text, "{%08X-%04X-%04X-%02X%02X-%02X%02X%02X%02X%02X%02X}",
+                  guid.Data1, guid.Data2, guid.Data3, guid.Data4[0], guid.Data4[1], guid.Data4[2],
+                  guid.Data4[3], guid.Data4[4], guid.Data4[5], guid.Data4[6], guid.Data4[7]);
+    return text;
+}
+
+std::string toText(const PropertyValue& value) {
+    struct Text {
+        std::string operator()(bool flag) const { return flag ? "true" : "false"; }
+        std::string operator()(std::int32_t number) const { return std::to_string(number); }
+        std::string operator()(std::uint32_t number) const { return std::to_string(number); }
+        std::string operator()(double number) const { return doubleText(number); }
+        std::string operator()(const GUID& guid) const { return guidText(guid); }
+        std::string operator()(const std::string& text) const { return '"' + text + '"'; }
+        std::string operator()(const kxSysAttrTimestampUTC& time) const { return formatUtc(time); }
+    };
+    return std::visit(Text{}, value);
+}
+
+nlohmann::json toJson(const PropertyValue& value) {
+    struct Json {
+        nlohmann::json operator()(const GUID& guid) const { return guidText(guid); }
+        nlohmann::json operator()(const kxSysAttrTimestampUTC& time) const {
+            return {
+                {"seconds", time.seconds}, {"fraction", time.fraction}, {"utc", formatUtc(time)}};
+        }
+        nlohmann::json operator()(bool flag) const { return flag; }
+        nlohmann::json operator()(std::int32_t number) const { return number; }
+        nlohmann::json operator()(std::uint32_t number) const { return number; }
+        nlohmann::json operator()(double number) const { return number; }
+        nlohmann::json operator()(const std::string& text) const { return text; }
+    };
+    return std::visit(Json{}, value);
+}
+
+std::optional<PropertyValue> parseValue(std::string_view text, kxSysPropertyType type) {
+    switch (type) {
+        case kxSysPropertyTypeBool:
+            return parseBool(text);
+        case kxSysPropertyTypeLong:
+            return parseNumber<std::int32_t>(text);
+        case kxSysPropertyTypeULong:
+            return parseNumber<std::uint32_t>(text);
+        case kxSysPropertyTypeDouble:
+            return parseNumber<double>(text);
+        case kxSysPropertyTypeString:
+            return std::string(text);
+        case kxSysPropertyTypeTimestamp: {
+            const auto time = parseUtc(text);
+            return time ? std::optional<PropertyValue>(*time) : std::nullopt;
+        }
+        default:
+            return std::nullopt;
+    }
+}
+
+HRESULT storeValue(IkxSysPropertyBag2& bag, kxSysAttributeTagID tag, const PropertyValue& value) {
+    struct Store {
+        IkxSysPropertyBag2& bag;
+        kxSysAttributeTagID tag;
+        HRESULT operator()(bool flag) const { return bag.SetBool(tag, flag ? 1 : 0); }
+        HRESULT operator()(std::int32_t number) const { return bag.SetLong(tag, number); }
+        HRESULT operator()(std::uint32_t number) const { return bag.SetULong(tag, number); }
+        HRESULT operator()(double number) const { return bag.SetDouble(tag, number); }
+        HRESULT operator()(const GUID& guid) const { return bag.SetGUID(tag, &guid); }
+        HRESULT operator()(const std::string& text) const {
+            return bag.SetString(tag, toUtf16(text).c_str());
+        }
+        HRESULT operator()(const kxSysAttrTimestampUTC& time) const {
+            return bag.SetTimestamp(tag, &time);
+        }
+    };
+    return std::visit(Store{bag, tag}, value);
+}
+
+}  // namespace corbel

@@ -1,0 +1,30 @@
+#ifndef QV_CORBEL_TAGCATALOG_H
+#define QV_CORBEL_TAGCATALOG_H
+
+#include <qv1588/corbel.h>
+
+#include <span>
+#include <string>
+#include <string_view>
+
+namespace corbel {
+
+// What the command line knows of a tag is the expert's vocabulary in the public header.
+using TagInfo = kxQvAttribute;
+
+std::span<const TagInfo> allTags();
+
+// By symbolic name (any case) or by number ("0xE006000", any case, or decimal); null when
+// the expert does not know it.
+const TagInfo* findTag(std::string_view nameOrNumber);
+const TagInfo* findTag(kxSysAttributeTagID tag);
+
+// "0x" and seven upper-case hexadecimal digits: the key of a tag in JSON output.
+std::string tagText(kxSysAttributeTagID tag);
+
+// "bool", "i32", "u32", "double", "guid", "string", "timestamp".
+const char* typeName(ULONG type);
+
+}  // namespace corbel
+
+#endif

@@ -1,0 +1,42 @@
+#ifndef QV_TESTS_EXPERT_NETWORK_LOADEDEXPERT_H
+#define QV_TESTS_EXPERT_NETWORK_LOADEDEXPERT_H
+
+#include <cstdint>
+#include <map>
+#include <string>
+#include <vector>
+
+#include "qv1588/corbel.h"
+#include "tests/expert/clocks/BagText.h"
+#include "tests/support/TestNetwork.h"
+
+namespace qvtest {
+
+// libqv1588.so as a host loads it: dlopen, then the one export by name.
+class LoadedExpert {
+  public:
+    LoadedExpert();
+    ~LoadedExpert();
+    LoadedExpert(const LoadedExpert&) = delete;
+    LoadedExpert& operator=(const LoadedExpert&) = delete;
+
+    // Null when the library or its export cannot be found (failure() says why).
+    createCorbelExpertFunction create() const { return create_; }
+    const std::string& failure() const { return failure_; }
+
+  private:
+    void* library_ = nullptr;
+    createCorbelExpertFunction create_ = nullptr;
+    std::string failure_;
+};
+
+// What pmc prints for one GET of `clock` in its domain: name -> value text.
+std::map<std::string, std::string> pmcValues(const TestNetwork& network, const TestClock& clock,
+                                             const std::string& managementId);
+
+// The item name of a test clock's port, e.g. 02-00-00-FF-FE-00-00-01:1.
+std::u16string itemNameOf(const TestClock& clock);
+
+}  // namespace qvtest
+
+#endif
