@@ -12,7 +12,8 @@ set(CMAKE_FIND_ROOT_PATH /usr/${QV_MINGW_PREFIX})
 set(CMAKE_FIND_ROOT_PATH_MODE_PROGRAM NEVER)
 set(CMAKE_FIND_ROOT_PATH_MODE_LIBRARY ONLY)
 set(CMAKE_FIND_ROOT_PATH_MODE_INCLUDE ONLY)
-set(CMAKE_FIND_ROOT_PATH_MODE_PACKAGE ONLY)
+# Header-only packages (CLI11, nlohmann_json) come from the build machine.
+set(CMAKE_FIND_ROOT_PATH_MODE_PACKAGE BOTH)
 
 # Programs and the library carry their run-time (libstdc++, libgcc, winpthread) inside, so
 # they run on a Windows without MinGW and under Wine without a search path.

@@ -102,8 +102,7 @@ class tUDPNetworkInterface::tReceiveScope {
 };
 
 tUDPNetworkInterface::tUDPNetworkInterface() {
-    destination_.sin_family = AF_INET;
-    destination_.sin_addr.s_addr = inet_addr(kMulticastGroup);
+    groupAddress_ = inet_addr(kMulticastGroup);
 }
 
 tUDPNetworkInterface::~tUDPNetworkInterface() {
@@ -158,7 +157,7 @@ int tUDPNetworkInterface::openReceiveSocket(std::uint16_t port, tStatus& status)
     local.sin_port = htons(port);
     local.sin_addr.s_addr = localInterfaceAddress_;
     ip_mreq membership{};
-    membership.imr_multiaddr = destination_.sin_addr;
+    membership.imr_multiaddr.s_addr = groupAddress_;
     membership.imr_interface.s_addr = localInterfaceAddress_;
     // The larger buffer is a wish, not a need: a smaller one still works.
     setOption(fd, SOL_SOCKET, SO_RCVBUF, kReceiveBufferOctets);
@@ -210,7 +209,9 @@ void tUDPNetworkInterface::sendTo(std::uint16_t port, const tProtocolDataUnit& u
     if (status.failed()) {
         return;
     }
-    sockaddr_in target = destination_;
+    sockaddr_in target{};
+    target.sin_family = AF_INET;
+    target.sin_addr.s_addr = groupAddress_;
     target.sin_port = htons(port);
     if (sendto(handleOf(sendSocket_.load()), reinterpret_cast<const char*>(unit.getBuffer()),
                static_cast<int>(unit.getLength()), 0, reinterpret_cast<const sockaddr*>(&target),
@@ -352,8 +353,8 @@ void tUDPNetworkInterface::drainWake() {
 tPortAddress tUDPNetworkInterface::getPortAddress() {
     constexpr std::uint16_t kUdpIpv4 = 1;
     std::uint8_t address[4];
-    std::memcpy(address, &destination_.sin_addr.s_addr, sizeof(address));  // network order
-    tStatus unused;                                                        // four octets always fit
+    std::memcpy(address, &groupAddress_, sizeof(address));  // network order
+    tStatus unused;                                         // four octets always fit
     return tPortAddress(kUdpIpv4, sizeof(address), address, unused);
 }
 
