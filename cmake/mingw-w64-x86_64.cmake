@@ -12,8 +12,7 @@ set(CMAKE_FIND_ROOT_PATH /usr/${QV_MINGW_PREFIX})
 set(CMAKE_FIND_ROOT_PATH_MODE_PROGRAM NEVER)
 set(CMAKE_FIND_ROOT_PATH_MODE_LIBRARY ONLY)
 set(CMAKE_FIND_ROOT_PATH_MODE_INCLUDE ONLY)
-# Header-only packages (CLI11, nlohmann_json) come from the build machine.
-set(CMAKE_FIND_ROOT_PATH_MODE_PACKAGE BOTH)
+set(CMAKE_FIND_ROOT_PATH_MODE_PACKAGE ONLY)
 
 # Programs and the library carry their run-time (libstdc++, libgcc, winpthread) inside, so
 # they run on a Windows without MinGW and under Wine without a search path.
