@@ -24,12 +24,25 @@ CommandContext::CommandContext(const Options& options)
 
 bool CommandContext::open(bool network, ExitCode& failed) {
     session_ = std::make_unique<ExpertSession>(expertPath_);
-    if (session_->isReady() && (!network || session_->initialize())) {
+    if (!session_->isReady()) {
+        output_.error("no-expert", session_->failure());
+    } else if (network && !session_->initialize()) {
+        const std::string reason = lastFailure();
+        output_.error("no-expert", session_->failure() + (reason.empty() ? "" : ": " + reason));
+    } else {
         return true;
     }
-    output_.error("no-expert", session_->failure());
     failed = ExitCode::kNoExpert;
     return false;
+}
+
+std::string CommandContext::lastFailure() const {
+    const auto failures = queryInterface<IkxQvLastFailure>(expert(), IID_IkxQvLastFailure);
+    OwnedBstr description;
+    if (!failures || failures->GetLastFailure(description.out(), nullptr) != S_OK) {
+        return {};
+    }
+    return description.utf8();
 }
 
 ComPtr<IkxSysPropertyBag> CommandContext::getItem(const std::string& item, ExitCode& failed) const {
@@ -41,7 +54,7 @@ ComPtr<IkxSysPropertyBag> CommandContext::getItem(const std::string& item, ExitC
     failed = reportFailure(FAILED(result) ? result : E_POINTER,
                            result == CORBEL_E_ITEM_NOT_FOUND
                                ? "no clock answers to the item name " + item
-                               : "cannot look up " + item + " (discovery failed)",
+                               : "cannot look up " + item,
                            {{"item", item}});
     return {};
 }
@@ -51,7 +64,9 @@ ExitCode CommandContext::reportFailure(HRESULT result, const std::string& what,
     const ExitCode code = exitCodeOf(result);
     std::string message = what;
     if (code == ExitCode::kFailed) {
-        message += " (" + hresultText(result) + ")";
+        const std::string reason = lastFailure();
+        message += (reason.empty() ? "" : ": " + reason) + " (" + hresultText(result) + ")";
+        details["reason"] = reason;
     }
     details["result"] = hresultText(result);
     output_.error(errorKind(code), message, details);

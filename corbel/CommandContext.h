@@ -43,11 +43,15 @@ class CommandContext {
     // know; empty when there is none, with the reason reported and its exit code in `failed`.
     ComPtr<IkxSysPropertyBag> getItem(const std::string& item, ExitCode& failed) const;
 
-    // Reports a failed item operation (with `details` in JSON); returns its exit code.
+    // Reports a failed item operation with the expert's reason for it (and `details` in
+    // JSON); returns its exit code. Call it before the next expert operation.
     ExitCode reportFailure(HRESULT result, const std::string& what,
                            nlohmann::json details = nlohmann::json::object()) const;
 
   private:
+    // Why the expert's last operation on this thread failed, when it says.
+    std::string lastFailure() const;
+
     Output output_;
     DiscoveryWait wait_;
     std::unique_ptr<ExpertSession> session_;

@@ -66,8 +66,10 @@ bool ExpertSession::initialize() {
     const HRESULT result = expert_->Initialize();
     initialized_ = SUCCEEDED(result);
     if (!initialized_) {
-        failure_ = "the expert cannot open its network side (" + hresultText(result) +
-                   "): it needs the UDP ports 319 and 320, which only root may bind";
+        failure_ =
+            "the expert cannot open the PTP ports (UDP 319 and 320 need root or "
+            "CAP_NET_BIND_SERVICE; " +
+            hresultText(result) + ")";
     }
     return initialized_;
 }

@@ -73,12 +73,8 @@ ExitCode validateAndApply(const CommandContext& context, const std::string& item
     ULONG ignored = 0;
     const HRESULT applied = context.expert().ApplyChanges(name.c_str(), &bag, &ignored);
     if (FAILED(applied)) {
-        return context.reportFailure(
-            applied,
-            item +
-                ": the clock refused the change or did not answer (changes before it in tag "
-                "order may have been written)",
-            {{"item", item}});
+        return context.reportFailure(applied, item + ": cannot write the changes",
+                                     {{"item", item}});
     }
     return ExitCode::kSuccess;
 }

@@ -73,18 +73,15 @@ std::vector<Refusal> readFromClock(const CommandContext& context, const std::str
         ComPtr<IkxSysPropertyBag> bag;
         const HRESULT result = context.expert().GetItemProperties(
             name.c_str(), static_cast<ULONG>(tags.size()), tags.data(), nullptr, bag.out());
+        if (FAILED(result)) {  // reported before the bag is read: the reason is per call
+            context.reportFailure(result, item + ": cannot read the " + group.name,
+                                  {{"item", item}, {"group", group.name}});
+            refusals.push_back({&group, tags});
+        }
         if (bag) {
             for (auto& [tag, value] : readBag(*bag)) {
                 values.insert_or_assign(tag, std::move(value));
             }
-        }
-        if (FAILED(result)) {
-            context.reportFailure(result,
-                                  item + ": no " + group.name +
-                                      " (the clock refused the request "
-                                      "or did not answer)",
-                                  {{"item", item}, {"group", group.name}});
-            refusals.push_back({&group, tags});
         }
     }
     return refusals;

@@ -79,7 +79,10 @@ int main(int argc, char** argv) {
         "show", "a clock's settings as read from it; every readable tag when none is given"));
     show->add_option("item", item, "item name, e.g. 02-11-22-FF-FE-33-44-55:1")->required();
     show->add_option("tags", words, "tag names (priority1) or numbers (0xE006000)");
-    auto* set = app.add_subcommand("set", "validates new values, then writes them to the clock");
+    auto* set = app.add_subcommand(
+        "set",
+        "validates new values, then writes them to the clock in tag order, stopping at the "
+        "first one it refuses");
     set->add_option("item", item, "item name, e.g. 02-11-22-FF-FE-33-44-55:1")->required();
     set->add_option("changes", words,
                     "NAME=VALUE: integers, doubles, true/false/1/0, text, "

@@ -13,6 +13,7 @@
 #include "expert/QVGuardedSlot.h"
 #include "expert/clocks/CPtpAttributeReader.h"
 #include "expert/clocks/CPtpAttributeWriter.h"
+#include "expert/clocks/CPtpLastFailure.h"
 #include "platform/BStr.h"
 #include "platform/EthernetAdapters.h"
 #include "platform/FindClocksTimeout.h"
@@ -51,6 +52,7 @@ std::span<const QVInterfaceEntry> CPtpSysExpert::InterfaceTable() {
     static constexpr QVInterfaceEntry kTable[] = {
         QVInterface<CPtpSysExpert, IkxSysExpert2>(IID_IkxSysExpert2),
         QVInterface<CPtpSysExpert, IkxSysExpert>(IID_IkxSysExpert),
+        QVInterface<CPtpSysExpert, IkxQvLastFailure>(IID_IkxQvLastFailure),
     };
     return kTable;
 }
@@ -94,6 +96,7 @@ HRESULT CPtpSysExpert::GetShortName(BSTR* name) {
 HRESULT CPtpSysExpert::Initialize() {
     return QVGuardedSlot([&]() -> HRESULT {
         std::lock_guard<std::mutex> guard(lifeLock_);
+        CPtpLastFailure::clear();
         if (ownedNode_) {
             return QV_E_ALREADY_INITIALIZED;
         }
@@ -106,6 +109,7 @@ HRESULT CPtpSysExpert::Initialize() {
         node->open(status);
         if (status.failed()) {
             // Nothing half-open stays behind: a later Initialize may try again.
+            CPtpLastFailure::record("opening the management node", status);
             tStatus closing;
             node->close(closing);
             return E_FAIL;
@@ -130,7 +134,11 @@ HRESULT CPtpSysExpert::Shutdown() {
 
 bool CPtpSysExpert::refreshClockList() {
     tStatus status;
-    return clocks_.refresh(*openNode(), discoveryTimeout_.load(), status);
+    if (clocks_.refresh(*openNode(), discoveryTimeout_.load(), status)) {
+        return true;
+    }
+    CPtpLastFailure::record("discovery", status);
+    return false;
 }
 
 HRESULT CPtpSysExpert::itemBag(const std::u16string& name, IkxSysPropertyBag2** bag) {
@@ -149,6 +157,7 @@ HRESULT CPtpSysExpert::itemBag(const std::u16string& name, IkxSysPropertyBag2** 
 
 HRESULT CPtpSysExpert::EnumerateItems(IkxSysItemCollector* collector) {
     return QVGuardedSlot([&]() -> HRESULT {
+        CPtpLastFailure::clear();
         if (collector == nullptr) {
             return E_POINTER;
         }
@@ -177,6 +186,7 @@ HRESULT CPtpSysExpert::EnumerateItems(IkxSysItemCollector* collector) {
 
 HRESULT CPtpSysExpert::GetItemNames(IkxSysEnumStringList** names) {
     return QVGuardedSlot([&]() -> HRESULT {
+        CPtpLastFailure::clear();
         if (names == nullptr) {
             return E_POINTER;
         }
@@ -204,6 +214,7 @@ HRESULT CPtpSysExpert::GetItemNames(IkxSysEnumStringList** names) {
 
 HRESULT CPtpSysExpert::GetItem(const OLECHAR* name, IkxSysPropertyBag** item) {
     return QVGuardedSlot([&]() -> HRESULT {
+        CPtpLastFailure::clear();
         if (item == nullptr) {
             return E_POINTER;
         }
@@ -232,6 +243,7 @@ HRESULT CPtpSysExpert::GetItemProperties(const OLECHAR* name, ULONG count,
                                          const kxSysAttributeTagID* tags, void* /*reserved*/,
                                          IkxSysPropertyBag** properties) {
     return QVGuardedSlot([&]() -> HRESULT {
+        CPtpLastFailure::clear();
         if (properties == nullptr || (tags == nullptr && count != 0)) {
             return E_POINTER;
         }
@@ -252,6 +264,9 @@ HRESULT CPtpSysExpert::GetItemProperties(const OLECHAR* name, ULONG count,
         tStatus failure;
         const HRESULT result =
             CPtpAttributeReader::readRequested(*proxy, count, tags, *bag.get(), failure);
+        if (result == E_FAIL) {
+            CPtpLastFailure::record("reading the clock's attributes", failure);
+        }
         *properties = bag.Detach();
         return result;
     });
@@ -302,6 +317,7 @@ HRESULT CPtpSysExpert::ValidateChanges(const OLECHAR* /*name*/, IkxSysPropertyBa
 HRESULT CPtpSysExpert::ApplyChanges(const OLECHAR* name, IkxSysPropertyBag* changes,
                                     ULONG* result) {
     return QVGuardedSlot([&]() -> HRESULT {
+        CPtpLastFailure::clear();
         if (changes == nullptr) {
             return E_POINTER;
         }
@@ -315,7 +331,17 @@ HRESULT CPtpSysExpert::ApplyChanges(const OLECHAR* name, IkxSysPropertyBag* chan
         const std::u16string itemName = textOf(name);
         tStatus failure;
         // An unknown item fails as a write that could not be made: E_FAIL.
-        return CPtpAttributeWriter::apply(
+        const HRESULT applied = CPtpAttributeWriter::apply(
             *changes, [&] { return CPtpClockList::lookup(*node, itemName); }, failure);
+        if (applied == E_FAIL) {
+            CPtpLastFailure::record(failure.failed() ? "writing a changed attribute to the clock"
+                                                     : "no clock is known under the item name",
+                                    failure);
+        }
+        return applied;
     });
+}
+
+HRESULT CPtpSysExpert::GetLastFailure(BSTR* description, BSTR* trace) {
+    return QVGuardedSlot([&] { return CPtpLastFailure::get(description, trace); });
 }

@@ -20,9 +20,12 @@
 // The expert: every PTP clock port that answers management messages on the network is an
 // item whose attributes the host reads and changes. Created as CQVComObject<CPtpSysExpert>.
 //
+// Why an operation failed is kept per calling thread (IkxQvLastFailure, CPtpLastFailure).
+//
 // Threads: the host may call every operation from several threads at once. Initialize and
 // Shutdown are serialised by `lifeLock_`; item operations see the node only once it is open.
 class CPtpSysExpert : public IkxSysExpert2,
+                      public IkxQvLastFailure,
                       public virtual CQVComObjectRootEx<CQVComMultiThreadModelNoCS> {
   public:
     static constexpr const char16_t* kDisplayName = u"QV-1588 2008";
@@ -53,6 +56,7 @@ class CPtpSysExpert : public IkxSysExpert2,
                                        IkxSysEnumPropertyTag** accepted, BSTR* message) override;
     HRESULT KXSYS_CALL ApplyChanges(const OLECHAR* name, IkxSysPropertyBag* changes,
                                     ULONG* result) override;
+    HRESULT KXSYS_CALL GetLastFailure(BSTR* description, BSTR* trace) override;
 
   protected:
     CPtpSysExpert() = default;

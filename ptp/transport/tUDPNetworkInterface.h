@@ -27,8 +27,12 @@ class tUDPNetworkInterface final : public iPTPPortMessaging {
     static constexpr std::size_t kMaxDatagram = 1024;
     static constexpr int kWaitStepMilliseconds = 500;
     static constexpr std::uint64_t kCompatibilityLength = 124;
-    // Room in the kernel for a burst of answers (a thousand clocks answering one discovery)
-    // while the receive thread decodes.
+    // Room in the kernel for a burst of answers (a thousand clocks answering one discovery,
+    // one to two megabytes as the kernel counts them) while the receive thread decodes. Kept at
+    // 4 MiB because the receive loop drains it fast: it drops a bad datagram without a pause
+    // (tests/bench/BadDatagramBench: some 20,000 to 70,000 a second here), so even a queue
+    // filled by a flood (a few thousand datagrams) is read within a fraction of a second,
+    // far inside an exchange's 5 s time-out.
     static constexpr int kReceiveBufferOctets = 4 * 1024 * 1024;
 
     tUDPNetworkInterface();

@@ -98,7 +98,7 @@ TEST_F(Corbel, EndsWithTheDocumentedCodeAndSaysWhyOnStandardError) {
         {"set " + kPtpd + " priority1=300 domainNumber=7", 3,
          "Domain must be an integer within the range 0 (PTP default domain) to 3.\n"
          "  Priority values must be integers within the range 0-255."},
-        {"set " + kPtp4l + " priority1=50", 4, "the clock refused the change or did not answer"},
+        {"set " + kPtp4l + " priority1=50", 4, "refused by the clock: NOT_SUPPORTED"},
         {"show 02-11-22-FF-FE-00-00-01:1", 1, "no clock answers to the item name"},
         {"show " + kPtpd + " priority7", 2, "unknown tag 'priority7'"},
         {"set " + kPtpd + " priority1=high", 2, "priority1 takes a value of type u32"},

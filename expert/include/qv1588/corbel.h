@@ -268,7 +268,7 @@ inline ULONG SysStringLen(const OLECHAR* text) {
         std::memcpy(&octets, reinterpret_cast<const std::uint8_t*>(text) - sizeof octets,
                     sizeof octets);
     }
-    return octets / sizeof(OLECHAR);
+    return static_cast<ULONG>(octets / sizeof(OLECHAR));
 }
 
 // The attribute tags that the expert reads, sets or writes. The kxQv tags are the expert's
@@ -436,6 +436,23 @@ inline const kxQvAttribute* kxQvFindAttribute(const char* name) {
     }
     return nullptr;
 }
+
+// The expert's own interface beside its expert interfaces (QueryInterface on the expert):
+// why the last operation of the calling thread failed, in the manner of COM's per-thread
+// error information. Every item operation of the expert clears the calling thread's record
+// when it starts and fills it when a clock exchange, the discovery or the opening fails.
+inline constexpr IID IID_IkxQvLastFailure = {
+    0x1F618204, 0x6960, 0x4D0F, {0xB9, 0xB2, 0xDA, 0xCE, 0xD2, 0x65, 0xDA, 0xA6}};
+
+struct IkxQvLastFailure : IUnknown {
+    // `description`: what failed, in English; `trace`: the diagnostic line of the failure.
+    // Both are new BSTRs the caller frees (either pointer may be null). S_FALSE and null
+    // texts when the calling thread's last operation recorded no failure.
+    virtual HRESULT KXSYS_CALL GetLastFailure(BSTR* description, BSTR* trace) = 0;  // slot 3
+
+  protected:
+    ~IkxQvLastFailure() = default;
+};
 
 // The library's one export. The expert answers QueryInterface for IUnknown, IkxSysExpert and
 // IkxSysExpert2 with this same pointer.

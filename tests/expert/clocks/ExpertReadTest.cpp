@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <functional>
+#include <thread>
 
 #include "ptp/tManagementIdTable.h"
 #include "tests/expert/clocks/ExpertFixture.h"
@@ -55,6 +56,25 @@ TEST_F(ExpertFixture, OneRequestPerSourceInSourceOrderAndTheResultSaysWhatWasSer
     EXPECT_EQ(read({kxQvPriority1, kxQvUserDescription}, bag), E_FAIL);
     EXPECT_NE(bag.get(), nullptr);
     EXPECT_EQ(newRequests().size(), 2U);
+
+    // Why, for this thread only.
+    CQVComPtr<IkxQvLastFailure> why;
+    ASSERT_EQ(expert->QueryInterface(IID_IkxQvLastFailure, reinterpret_cast<void**>(why.Receive())),
+              S_OK);
+    BSTR description = nullptr;
+    BSTR trace = nullptr;
+    EXPECT_EQ(why->GetLastFailure(&description, &trace), S_OK);
+    EXPECT_EQ(std::u16string(description),
+              u"reading the clock's attributes: refused by the clock: GENERAL_ERROR (Failure "
+              u"getting value) (status -52012)");
+    EXPECT_EQ(std::u16string(trace).substr(0, 12), u"[qvptpmgmt--");  // as the record keeps it
+    SysFreeString(description);
+    SysFreeString(trace);
+    std::thread([&] { EXPECT_EQ(why->GetLastFailure(&description, nullptr), S_FALSE); }).join();
+    EXPECT_EQ(read({kxQvPriority1}, bag), E_FAIL);
+    managed.failures.getters = false;
+    EXPECT_EQ(read({kxQvPriority1}, bag), S_OK);
+    EXPECT_EQ(why->GetLastFailure(&description, &trace), S_FALSE);
 }
 
 TEST_F(ExpertFixture, ClockValuesAreConvertedAtTheirEdges) {

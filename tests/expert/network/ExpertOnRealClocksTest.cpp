@@ -206,6 +206,19 @@ TEST(ExpertOnRealClocks, FindsExactlyTheClocksAndReadsWhatPmcReads) {
         const HRESULT refusal = clock.impl == "ptp4l" ? E_FAIL : S_OK;
         EXPECT_EQ(hosted.read(clock, {kxQvTime}, refused), refusal);
         EXPECT_EQ(hosted.read(clock, {kxQvLeap59}, refused), refusal);
+        Held<IkxQvLastFailure> why;
+        hosted.expert->QueryInterface(IID_IkxQvLastFailure, reinterpret_cast<void**>(why.out()));
+        BSTR description = nullptr;
+        EXPECT_EQ(why->GetLastFailure(&description, nullptr), refusal == S_OK ? S_FALSE : S_OK);
+        std::string reason;
+        for (const OLECHAR* unit = description; unit != nullptr && *unit != 0; ++unit) {
+            reason.push_back(static_cast<char>(*unit));
+        }
+        // A refusal, not a time-out: the read failed as soon as ptp4l answered.
+        EXPECT_EQ(reason, refusal == S_OK ? ""
+                                          : "reading the clock's attributes: refused by the "
+                                            "clock: NOT_SUPPORTED (status -52012)");
+        SysFreeString(description);
     }
 }
 

@@ -1,0 +1,91 @@
+#include "expert/clocks/CPtpLastFailure.h"
+
+#include <cstring>
+#include <optional>
+
+#include "platform/BStr.h"
+#include "platform/tStatusReason.h"
+
+namespace {
+
+constexpr std::size_t kHeaderWidth = 49;
+
+struct tFailure {
+    std::u16string description;
+    std::u16string trace;
+};
+
+thread_local std::optional<tFailure> lastFailure;
+
+std::u16string widened(const std::string& text) {
+    return std::u16string(text.begin(), text.end());
+}
+
+// The exchange's own reason when it carries one ("refused by the clock: NOT_SUPPORTED").
+std::string causeOf(const tStatus& status) {
+    const std::string reason = tStatusReason::describe(status);
+    if (!reason.empty()) {
+        return reason;
+    }
+    switch (status.code) {
+        case kStatusNoData:
+            return "no valid answer came from the clock";
+        case kStatusSocketError:
+            return "the network refused a send or a receive";
+        case kStatusNoMemory:
+            return "memory ran out";
+        case kStatusOsObjectError:
+            return "an operating-system object could not be made";
+        default:
+            return "the exchange failed";
+    }
+}
+
+void deliver(const std::u16string& text, BSTR* out) {
+    if (out != nullptr) {
+        *out = qv::dsc::BStr::allocate(text.c_str());
+    }
+}
+
+}  // namespace
+
+void CPtpLastFailure::clear() noexcept {
+    lastFailure.reset();
+}
+
+void CPtpLastFailure::record(const char* what, const tStatus& status) {
+    if (status.code == 0) {
+        lastFailure = tFailure{widened(what), u""};
+        return;
+    }
+    lastFailure = tFailure{widened(std::string(what) + ": " + causeOf(status) + " (status " +
+                                   std::to_string(status.code) + ")"),
+                           widened(traceLineOf(status))};
+}
+
+HRESULT CPtpLastFailure::get(BSTR* description, BSTR* trace) {
+    for (BSTR* out : {description, trace}) {
+        if (out != nullptr) {
+            *out = nullptr;
+        }
+    }
+    if (!lastFailure) {
+        return S_FALSE;
+    }
+    deliver(lastFailure->description, description);
+    deliver(lastFailure->trace, trace);
+    return S_OK;
+}
+
+std::string CPtpLastFailure::traceLineOf(const tStatus& status) {
+    const auto field = [](const char* text, std::size_t size) {
+        return std::string(text, strnlen(text, size));
+    };
+    std::string header = "[" + field(status.component, tStatus::kComponentSize) + "--" +
+                         std::to_string(status.line) + "--" +
+                         field(status.file, tStatus::kFileSize);
+    if (header.size() < kHeaderWidth) {
+        header.append(kHeaderWidth - header.size(), '-');
+    }
+    return header + "] " + std::to_string(status.code);
+}

@@ -1,0 +1,26 @@
+#ifndef QV_EXPERT_CLOCKS_CPTPLASTFAILURE_H
+#define QV_EXPERT_CLOCKS_CPTPLASTFAILURE_H
+
+#include <string>
+
+#include "platform/tStatus.h"
+#include "qv1588/corbel.h"
+
+// The calling thread's record of why its last expert operation failed (IkxQvLastFailure).
+// A host reads it on the thread that made the failing call, as with COM's error objects;
+// the record is the thread's own, so threads never see each other's failures.
+class CPtpLastFailure {
+  public:
+    // Every item operation starts with an empty record.
+    static void clear() noexcept;
+    // `what` says which step failed; the status says where and why (a status without an
+    // error leaves `what` alone as the description).
+    static void record(const char* what, const tStatus& status);
+
+    static HRESULT get(BSTR* description, BSTR* trace);
+
+    // "[component--line--file------...] code": the trace header of the place that failed.
+    static std::string traceLineOf(const tStatus& status);
+};
+
+#endif
