@@ -47,7 +47,7 @@ void tStatusReason::record(tStatus& status, tKind kind, std::uint64_t number) no
 void tStatusReason::refused(tStatus& status, std::uint16_t managementErrorId,
                             std::string_view displayText) noexcept {
     record(status, tKind::kRefused, managementErrorId);
-    if (carries(status)) {
+    if (carries(status) && !displayText.empty()) {
         std::memcpy(&status.extension[kTextWord], displayText.data(),
                     std::min(displayText.size(), kTextSize - 1));
     }

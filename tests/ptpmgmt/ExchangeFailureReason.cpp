@@ -9,24 +9,17 @@
 namespace {
 
 using Fault = qvtest::SimulatedClock::Fault;
-using Kind = tStatusReason::tKind;
+using ExchangeFailureReason = qvtest::ProxyFixture;
 
-class ExchangeFailureReason : public qvtest::ProxyFixture {};
-
-// Every failed exchange keeps -52012; its extension words tell why.
+// Every failed exchange keeps -52012; its extension words and its trace line tell why.
 TEST_F(ExchangeFailureReason, TheStatusSaysWhyTheExchangeFailed) {
     const struct {
         Fault fault;
-        Kind kind;
-        std::uint64_t number;
-        std::string text;
-        std::string description;
+        std::string description;  // from the clock's error id and text, or the time-out
     } cases[] = {
-        {Fault::errorStatus, Kind::kRefused, 0xFFFE, "simulated failure",
-         "refused by the clock: GENERAL_ERROR (simulated failure)"},
-        {Fault::silent, Kind::kNoAnswer, 20, "", "no answer within 20 ms"},
-        {Fault::wrongAction, Kind::kWrongAnswer, 4U << 16 | 0x2005, "",
-         "answer of the wrong kind (actionField 4, managementId 0x2005)"},
+        {Fault::errorStatus, "refused by the clock: GENERAL_ERROR (simulated failure)"},
+        {Fault::silent, "no answer within 20 ms"},
+        {Fault::wrongAction, "answer of the wrong kind (actionField 4, managementId 0x2005)"},
     };
     proxy().setExchangeTimeout(20);
     for (const auto& c : cases) {
@@ -35,11 +28,8 @@ TEST_F(ExchangeFailureReason, TheStatusSaysWhyTheExchangeFailed) {
         const qvtest::DebugOutputCapture trace;
         proxy().getPriority1(status);
         EXPECT_EQ(status.code, kStatusNoData);
-        EXPECT_EQ(tStatusReason::kindOf(status), c.kind);
-        EXPECT_EQ(tStatusReason::numberOf(status), c.number);
-        EXPECT_EQ(tStatusReason::textOf(status), c.text);
         EXPECT_EQ(tStatusReason::describe(status), c.description);
-        EXPECT_NE(trace.text().find("failed: " + c.description), std::string::npos) << trace.text();
+        EXPECT_NE(trace.text().find("failed: " + c.description), std::string::npos);
     }
 }
 

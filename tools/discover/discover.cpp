@@ -12,6 +12,7 @@
 
 #include "platform/EthernetAdapters.h"
 #include "platform/FindClocksTimeout.h"
+#include "platform/tStatusReason.h"
 #include "ptp/TLVs/tDefaultDataSetTLV.h"
 #include "ptp/TLVs/tPortDataSetTLV.h"
 #include "ptp/transport/tUDPNetworkInterface.h"
@@ -51,7 +52,8 @@ void printClock(iPTPClockProxy& proxy) {
             defaults.getPriority1(), defaults.getPriority2(), quality.clockClass,
             quality.clockAccuracy, defaults.getSlaveOnly() ? "yes" : "no");
     } else {
-        std::printf("  default data set: no answer (%d)\n", status.code);
+        std::printf("  default data set: %d, %s\n", status.code,
+                    tStatusReason::describe(status).c_str());
     }
 
     status.reset();
