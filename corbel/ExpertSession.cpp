@@ -1,24 +1,22 @@
 #include "corbel/ExpertSession.h"
 
-#include <dlfcn.h>
-#include <unistd.h>
-
 #include <filesystem>
 #include <vector>
 
 #include "corbel/ExitCode.h"
+#include "corbel/SharedLibrary.h"
 
 namespace corbel {
 
 namespace {
 
 std::vector<std::string> defaultCandidates() {
-    std::error_code error;
-    const auto program = std::filesystem::read_symlink("/proc/self/exe", error);
+    const std::string folder = SharedLibrary::programFolder();
     std::vector<std::string> candidates;
-    if (!error) {
-        candidates.push_back(
-            (program.parent_path() / QV_CORBEL_EXPERT_FROM_BINDIR).lexically_normal().string());
+    if (!folder.empty()) {
+        candidates.push_back((std::filesystem::path(folder) / QV_CORBEL_EXPERT_FROM_BINDIR)
+                                 .lexically_normal()
+                                 .string());
     }
 #ifdef QV_CORBEL_EXPERT_BUILT
     candidates.emplace_back(QV_CORBEL_EXPERT_BUILT);
@@ -34,7 +32,7 @@ ExpertSession::ExpertSession(const std::string& libraryPath) {
         return;
     }
     for (const std::string& candidate : defaultCandidates()) {
-        if (access(candidate.c_str(), F_OK) == 0) {
+        if (SharedLibrary::exists(candidate)) {
             load(candidate);
             return;
         }
@@ -44,13 +42,14 @@ ExpertSession::ExpertSession(const std::string& libraryPath) {
 
 void ExpertSession::load(const std::string& path) {
     path_ = path;
-    library_ = dlopen(path.c_str(), RTLD_NOW | RTLD_LOCAL);
+    std::string error;
+    library_ = SharedLibrary::load(path, error);
     if (library_ == nullptr) {
-        failure_ = std::string("cannot load the expert library: ") + dlerror();
+        failure_ = "cannot load the expert library: " + error;
         return;
     }
-    auto* create =
-        reinterpret_cast<createCorbelExpertFunction>(dlsym(library_, "createCorbelExpert"));
+    auto* create = reinterpret_cast<createCorbelExpertFunction>(
+        SharedLibrary::find(library_, "createCorbelExpert"));
     if (create == nullptr) {
         failure_ = path + " exports no createCorbelExpert";
         return;
@@ -82,7 +81,7 @@ ExpertSession::~ExpertSession() {
         expert_->Release();
     }
     if (library_ != nullptr) {
-        dlclose(library_);
+        SharedLibrary::release(library_);
     }
 }
 

@@ -7,7 +7,7 @@
 
 namespace corbel {
 
-// The expert library loaded with dlopen and one expert object made by its export, for the
+// The expert library loaded (SharedLibrary) and one expert object made by its export, for the
 // lifetime of one command. The destructor shuts the expert down when it was initialised,
 // gives back its reference and unloads the library, in that order.
 class ExpertSession {

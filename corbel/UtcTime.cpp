@@ -4,6 +4,8 @@
 #include <cstdio>
 #include <ctime>
 
+#include "corbel/UtcCalendar.h"
+
 namespace corbel {
 
 namespace {
@@ -42,7 +44,7 @@ std::optional<std::uint32_t> parseFraction(std::string_view digits) {
 std::string formatUtc(const kxSysAttrTimestampUTC& time) {
     const auto seconds = static_cast<std::time_t>(time.seconds - kUnixEpochSince1904);
     std::tm fields{};
-    if (gmtime_r(&seconds, &fields) == nullptr) {
+    if (!UtcCalendar::fieldsOf(seconds, fields)) {
         return "?";
     }
     char text[64];
@@ -85,7 +87,7 @@ std::optional<kxSysAttrTimestampUTC> parseUtc(std::string_view text) {
     const int day = fields.tm_mday;
     fields.tm_year -= 1900;
     fields.tm_mon -= 1;
-    const std::time_t seconds = timegm(&fields);
+    const std::time_t seconds = UtcCalendar::secondsOf(fields);
     if (!inRange || fields.tm_mday != day) {  // a day that the month does not have
         return std::nullopt;
     }

@@ -12,7 +12,8 @@ using WideChar = char16_t;
 
 // A host string: pointer to the first of `length` UTF-16 code units followed by a NUL, with
 // the length in octets stored in the four octets before it. The side that receives one
-// owns it and releases it with BStr::release. A null BSTR is a valid empty string.
+// owns it and releases it with BStr::release. A null BSTR is a valid empty string. On
+// Windows (BStrWin32.cpp) these are the system's strings (SysAllocStringLen, SysFreeString).
 using BSTR = WideChar*;
 
 class BStr {

@@ -52,13 +52,4 @@ std::optional<EthernetAdapters::tMacAddress> EthernetAdapters::firstAddress() {
     return std::nullopt;
 }
 
-EthernetAdapters::tClockIdentity EthernetAdapters::clockIdentityOf(
-    const std::optional<tMacAddress>& address) {
-    if (!address) {
-        return {'Q', 'V', 'P', 'T', 'P', 'C', 'L', 'K'};
-    }
-    const tMacAddress& mac = *address;
-    return {mac[0], mac[1], mac[2], 0xFF, 0xFE, mac[3], mac[4], mac[5]};
-}
-
 }  // namespace qv::dsc::osdep

@@ -20,7 +20,13 @@ class EthernetAdapters {
 
     // EUI-64 of a MAC address: its first three octets, FF FE, its last three octets.
     // Without an address, the eight octets "QVPTPCLK".
-    static tClockIdentity clockIdentityOf(const std::optional<tMacAddress>& address);
+    static tClockIdentity clockIdentityOf(const std::optional<tMacAddress>& address) {
+        if (!address) {
+            return {'Q', 'V', 'P', 'T', 'P', 'C', 'L', 'K'};
+        }
+        const tMacAddress& mac = *address;
+        return {mac[0], mac[1], mac[2], 0xFF, 0xFE, mac[3], mac[4], mac[5]};
+    }
     static tClockIdentity localClockIdentity() { return clockIdentityOf(firstAddress()); }
 };
 

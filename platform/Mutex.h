@@ -8,6 +8,9 @@
 
 namespace qv::dsc::osdep {
 
+// On Windows (MutexWin32.cpp) it is the named kernel mutex "Global\<name>" with a security
+// descriptor that lets every process open it; path() answers that name.
+//
 // A lock shared by every process of every user on the computer, known by name: an advisory
 // lock (flock) on the file "<folder>/qv-1588-<name>.lock". The folder is $QV_LOCK_DIR when
 // set (tests), otherwise /run/lock, or /tmp on a system without it.

@@ -8,7 +8,8 @@ namespace qv::dsc {
 // The allocator whose blocks may cross the host boundary: a block allocated on one side is
 // released on the other, so both sides use these three functions and nothing else.
 // A null result for a non-zero size throws std::bad_alloc; on that failure of
-// `reallocate` the old block is untouched and still belongs to the caller.
+// `reallocate` the old block is untouched and still belongs to the caller. On Windows
+// (TaskMemoryWin32.cpp) the blocks are COM task memory (CoTaskMemAlloc/Realloc/Free).
 class TaskMemory {
   public:
     static void* allocate(std::size_t size);

@@ -21,34 +21,6 @@ constexpr tErrnoPair kHostErrors[] = {
     {ELOOP, 1921},
 };
 
-struct tCodePair {
-    std::uint32_t hostError;
-    std::uint32_t code;
-};
-
-constexpr tCodePair kCodes[] = {
-    {0, 0},
-    {2, 7},
-    {3, 7},
-    {15, 7},
-    {4, 11},
-    {5, 0x80070005u},
-    {6, 1},
-    {87, 1},
-    {8, 2},
-    {14, 2},
-    {11, 23},
-    {16, 8},
-    {19, 8},
-    {32, 8},
-    {33, 8},
-    {20, 37},
-    {23, static_cast<std::uint32_t>(-508)},
-    {38, 4},
-    {39, 9},
-    {80, static_cast<std::uint32_t>(-98)},
-};
-
 // strerror_r comes in two shapes; each overload picks the text out of its own.
 [[maybe_unused]] const char* pickText(const char* result, const char*) {
     return result;
@@ -78,15 +50,6 @@ std::uint32_t WinError::hostErrorNumber(int posixError) noexcept {
         }
     }
     return kUnmappedFlag | static_cast<std::uint32_t>(posixError);
-}
-
-std::uint32_t WinError::codeOf(std::uint32_t hostError) noexcept {
-    for (const tCodePair& pair : kCodes) {
-        if (pair.hostError == hostError) {
-            return pair.code;
-        }
-    }
-    return OSException::kCode;
 }
 
 std::string WinError::messageOf(int posixError) {

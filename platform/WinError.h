@@ -12,7 +12,9 @@ namespace qv::dsc::osdep {
 // first translated to the error number that the same failure has on the host platform
 // (ENOENT is 2, EACCES is 5 ...), which is what `osErrorCode` answers and what selects
 // `errorCode`. An errno without such a counterpart becomes kUnmappedFlag | errno: that
-// number keeps the errno visible and never collides with a host number.
+// number keeps the errno visible and never collides with a host number. On Windows
+// (WinErrorWin32.cpp) the number is the system's own (GetLastError) and the text comes from
+// FormatMessageA.
 class WinError : public OSException {
   public:
     static constexpr std::uint32_t kUnmappedFlag = 0x20000000u;

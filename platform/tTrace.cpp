@@ -1,7 +1,5 @@
 #include "platform/tTrace.h"
 
-#include <unistd.h>
-
 #include <algorithm>
 #include <charconv>
 #include <chrono>
@@ -9,6 +7,7 @@
 #include <cstdio>
 #include <cstring>
 
+#include "platform/CurrentThread.h"
 #include "platform/tStatus.h"
 
 namespace nQVTARN000 {
@@ -177,7 +176,8 @@ void tTrace::writeHeader(const char* component, std::uint32_t line, const char* 
         field(file != nullptr ? sourceBaseName(file) : "");
     }
     if (on(Flag::showThread)) {
-        std::snprintf(number, sizeof(number), "%ld", static_cast<long>(gettid()));
+        std::snprintf(number, sizeof(number), "%lu",
+                      static_cast<unsigned long>(qv::dsc::osdep::CurrentThread::id()));
         field(number);
     }
     if (on(Flag::showTime)) {

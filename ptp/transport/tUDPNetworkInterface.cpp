@@ -1,6 +1,7 @@
 #include "ptp/transport/tUDPNetworkInterface.h"
 
 #include <arpa/inet.h>
+#include <netinet/in.h>
 #include <poll.h>
 #include <sys/eventfd.h>
 #include <sys/socket.h>
@@ -56,8 +57,7 @@ class tUDPNetworkInterface::tReceiveScope {
 };
 
 tUDPNetworkInterface::tUDPNetworkInterface() {
-    destination_.sin_family = AF_INET;
-    destination_.sin_addr.s_addr = inet_addr(kMulticastGroup);
+    groupAddress_ = inet_addr(kMulticastGroup);
 }
 
 tUDPNetworkInterface::~tUDPNetworkInterface() {
@@ -108,7 +108,7 @@ int tUDPNetworkInterface::openReceiveSocket(std::uint16_t port, tStatus& status)
     local.sin_port = htons(port);
     local.sin_addr.s_addr = localInterfaceAddress_;
     ip_mreq membership{};
-    membership.imr_multiaddr = destination_.sin_addr;
+    membership.imr_multiaddr.s_addr = groupAddress_;
     membership.imr_interface.s_addr = localInterfaceAddress_;
     // The larger buffer is a wish, not a need: beyond the system's limit only a privileged
     // process may go (SO_RCVBUFFORCE), and a smaller buffer still works.
@@ -163,7 +163,9 @@ void tUDPNetworkInterface::sendTo(std::uint16_t port, const tProtocolDataUnit& u
     if (status.failed()) {
         return;
     }
-    sockaddr_in target = destination_;
+    sockaddr_in target{};
+    target.sin_family = AF_INET;
+    target.sin_addr.s_addr = groupAddress_;
     target.sin_port = htons(port);
     if (sendto(sendSocket_.load(), unit.getBuffer(), unit.getLength(), 0,
                reinterpret_cast<const sockaddr*>(&target), sizeof(target)) < 0) {
@@ -290,8 +292,8 @@ void tUDPNetworkInterface::drainWake() {
 tPortAddress tUDPNetworkInterface::getPortAddress() {
     constexpr std::uint16_t kUdpIpv4 = 1;
     std::uint8_t address[4];
-    std::memcpy(address, &destination_.sin_addr.s_addr, sizeof(address));  // network order
-    tStatus unused;                                                        // four octets always fit
+    std::memcpy(address, &groupAddress_, sizeof(address));  // network order
+    tStatus unused;                                         // four octets always fit
     return tPortAddress(kUdpIpv4, sizeof(address), address, unused);
 }
 

@@ -1,8 +1,6 @@
 #ifndef QV_PTP_TRANSPORT_TUDPNETWORKINTERFACE_H
 #define QV_PTP_TRANSPORT_TUDPNETWORKINTERFACE_H
 
-#include <netinet/in.h>
-
 #include <atomic>
 #include <condition_variable>
 #include <cstdint>
@@ -70,12 +68,15 @@ class tUDPNetworkInterface final : public iPTPPortMessaging {
     std::atomic<int> eventSocket_{-1};
     std::atomic<int> generalSocket_{-1};
     std::atomic<int> sendSocket_{-1};
-    sockaddr_in destination_{};  // the group; each send copies it and sets its port
+    // The group's address in network byte order. No socket header here: on Windows it
+    // would bring the system's types, which clash with the host header's own.
+    std::uint32_t groupAddress_ = 0;
     std::atomic<bool> stopRequested_{false};
     std::uint32_t localInterfaceAddress_ = 0;  // network byte order; 0 is any interface
     std::atomic<bool> padEventMessages_{false};
-    std::atomic<int> wakeEvent_{-1};  // an eventfd that abortReceive and close signal
-    int lastSocket_ = -1;             // the socket read last; the receiving thread's only
+    // An eventfd (a loopback socket on Windows) that abortReceive and close signal.
+    std::atomic<int> wakeEvent_{-1};
+    int lastSocket_ = -1;  // the socket read last; the receiving thread's only
 
     std::mutex receiveLock_;  // guards activeReceives_ and closing_
     std::condition_variable receiveIdle_;
