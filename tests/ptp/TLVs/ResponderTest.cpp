@@ -51,6 +51,13 @@ void setUp(Clock& c) {
     c.port(2).logSyncInterval = -2;
 }
 
+// What a TLV writes is as long as its lengthField says, and even.
+void expectWhole(const tTLV& tlv) {
+    const std::size_t written = qvtest::hexOctets(qvtest::encode(tlv)).size();
+    EXPECT_EQ(written, tlv.getLengthField() + 4U);
+    EXPECT_EQ(written % 2, 0U);
+}
+
 const Row kRows[] = {
     {"SET CLOCK_ACCURACY reserved", kSet, 1, "00 01 00 04 20 10 | 1F | 00",
      "error 4 Unsupported clockAccuracy value", setUp},
@@ -131,6 +138,7 @@ TEST(ResponderTest, AnswersInOrderAgainstOneClock) {
         ASSERT_TRUE(status.succeeded()) << status.code;
         ASSERT_NE(answer, nullptr);
         EXPECT_EQ(answerText(*answer), row.answer);
+        expectWhole(*answer);
     }
     EXPECT_EQ(clock.defaultDataSet.priority2, 0x21);
 }
@@ -143,6 +151,8 @@ TEST(ResponderTest, EveryGetOfAFailingClockIsAGeneralError) {
         tStatus status;
         const auto answer = row.create()->respond(kGet, clock, 1, status);
         ASSERT_NE(answer, nullptr);
+        expectWhole(*row.create());
+        expectWhole(*answer);
         const std::string text = answerText(*answer);
         if (row.managementId == kNullManagement || row.managementId == kFaultLog) {
             EXPECT_EQ(text.find("error"), std::string::npos);    // the clock is not asked
