@@ -1,6 +1,5 @@
 #include <gtest/gtest.h>
 
-#include "ptp/tMessageHeader.h"
 #include "ptp/tTLVFactory.h"
 #include "tests/ptp/CodecTestSupport.h"
 
@@ -9,22 +8,6 @@
 using namespace nQVPTP000;
 
 namespace {
-
-TEST(TraceTextTest, HeaderDump) {
-    tMessageHeader header;
-    tStatus status;
-    header.setFlag(tMessageHeader::tFlag::leap59, true, status);
-    EXPECT_EQ(qvtest::traceText(header),
-              "--- Begin Message Header ---\ntransportSpecific: 0\nmessageType: 0xb\n"
-              "versionPTP: 2\nmessageLength: 0\ndomainNumber: 0\nalternateMasterFlag: FALSE\n"
-              "twoStepFlag: FALSE\nunicastFlag: FALSE\nprofileSpecific1: FALSE\n"
-              "profileSpecific2: FALSE\nSECURE: FALSE\nleap61: FALSE\nleap59: TRUE\n"
-              "currentUTCOffsetValid: FALSE\nptpTimescale: FALSE\ntimeTraceable: FALSE\n"
-              "frequencyTraceable: FALSE\ncorrectionField: 0\n"
-              "sourcePortIdentity: clockIdentity: ffffffffffffffff portNumber: 65535\n"
-              "sequenceId: 0\ncontrolField: 0\nlogMessageInterval: 127\n"
-              "--- End Message Header ---\n");
-}
 
 // What follows the header dump in a message's trace.
 TEST(TraceTextTest, MessageBodies) {

@@ -5,20 +5,11 @@
 
 #include "ptp/tPTPText.h"
 #include "ptp/tPortAddress.h"
-#include "ptp/tPortIdentity.h"
 #include "ptp/tTimeInterval.h"
 
 using namespace nQVPTP000;
 
 namespace {
-
-TEST(tPortIdentityTest, EqualityNeedsBothParts) {
-    const std::uint8_t octets[8] = {1, 2, 3, 4, 5, 6, 7, 8};
-    const tPortIdentity one(tClockIdentity(octets), 1);
-    EXPECT_EQ(one, tPortIdentity(tClockIdentity(octets), 1));
-    EXPECT_FALSE(one == tPortIdentity(tClockIdentity(octets), 2));
-    EXPECT_FALSE(one == tPortIdentity(allOnesClockIdentity(), 1));
-}
 
 // Nanoseconds beyond the 48 bits that scaled nanoseconds hold saturate; the way back rounds
 // toward zero.

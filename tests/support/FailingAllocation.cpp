@@ -19,6 +19,14 @@ void* allocate(std::size_t size) {
     throw std::bad_alloc();
 }
 
+void* allocateOrNull(std::size_t size) noexcept {
+    try {
+        return allocate(size);
+    } catch (const std::bad_alloc&) {
+        return nullptr;
+    }
+}
+
 }  // namespace
 
 namespace qvtest {
@@ -53,18 +61,10 @@ void* operator new[](std::size_t size) {
     return allocate(size);
 }
 void* operator new(std::size_t size, const std::nothrow_t&) noexcept {
-    try {
-        return allocate(size);
-    } catch (const std::bad_alloc&) {
-        return nullptr;
-    }
+    return allocateOrNull(size);
 }
 void* operator new[](std::size_t size, const std::nothrow_t&) noexcept {
-    try {
-        return allocate(size);
-    } catch (const std::bad_alloc&) {
-        return nullptr;
-    }
+    return allocateOrNull(size);
 }
 void operator delete(void* p) noexcept {
     std::free(p);

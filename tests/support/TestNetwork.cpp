@@ -12,19 +12,14 @@ namespace qvtest {
 
 namespace {
 
-// 1 to 8 characters: "q", the process id and a counter in base 36, so that runs of
-// parallel test programs and several networks of one program differ.
+// 8 characters: "q", the process id and a counter in hex, so that runs of parallel test
+// programs and the networks of one program that are up at once differ.
 std::string uniquePrefix() {
     static std::atomic<unsigned> counter{0};
-    const char* digits = "0123456789abcdefghijklmnopqrstuvwxyz";
-    auto pid = static_cast<unsigned long>(getpid());
-    std::string pidText;
-    do {
-        pidText.insert(pidText.begin(), digits[pid % 36]);
-        pid /= 36;
-    } while (pid != 0);
-    const unsigned count = counter++ % (36 * 36);
-    return "q" + pidText.substr(0, 5) + digits[count / 36] + digits[count % 36];
+    char prefix[16];
+    std::snprintf(prefix, sizeof prefix, "q%06x%x", static_cast<unsigned>(getpid()) & 0xFFFFFFU,
+                  counter++ % 16);
+    return prefix;
 }
 
 std::string shellQuoted(const std::string& text) {

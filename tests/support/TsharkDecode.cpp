@@ -8,6 +8,8 @@
 #include <memory>
 #include <stdexcept>
 
+#include "tests/support/Hex.h"
+
 namespace qvtest {
 
 namespace {
@@ -30,42 +32,19 @@ std::string attribute(const std::string& line, const std::string& name) {
     return text;
 }
 
-template <typename T>
-void put(std::string& out, T value, bool bigEndian) {
-    for (std::size_t i = 0; i < sizeof(T); ++i) {
-        const std::size_t shift = 8 * (bigEndian ? sizeof(T) - 1 - i : i);
-        out += static_cast<char>((value >> shift) & 0xFF);
-    }
-}
-
-// A capture file of raw IPv4 packets (link type 101), host order little-endian.
-std::string captureFile(const std::vector<std::vector<std::uint8_t>>& datagrams) {
-    std::string file;
-    for (std::uint32_t word : {0xA1B2C3D4U, 0x00040002U, 0U, 0U, 65535U, 101U}) {
-        put(file, word, false);
-    }
+// A hex dump that text2pcap makes a capture file of: one datagram per line.
+std::string hexDump(const std::vector<std::vector<std::uint8_t>>& datagrams) {
+    std::string dump;
     for (const auto& datagram : datagrams) {
-        const auto udpLength = static_cast<std::uint16_t>(8 + datagram.size());
-        const std::uint16_t port = !datagram.empty() && (datagram[0] & 0x0F) < 8 ? 319 : 320;
-        std::string packet;
-        for (int half : {0x4500, udpLength + 20, 0, 0, 0x0111, 0, 0xA9FE, 0x0001, 0xE000, 0x0181,
-                         int{port}, int{port}, int{udpLength}, 0}) {
-            put(packet, static_cast<std::uint16_t>(half), true);
-        }
-        packet.append(datagram.begin(), datagram.end());
-        for (std::uint32_t word : {0U, 0U, static_cast<std::uint32_t>(packet.size()),
-                                   static_cast<std::uint32_t>(packet.size())}) {
-            put(file, word, false);
-        }
-        file += packet;
+        dump += "000000 " + hexText(datagram) + "\n";
     }
-    return file;
+    return dump;
 }
 
 }  // namespace
 
 bool tsharkAvailable() {
-    return std::system("command -v tshark >/dev/null 2>&1") == 0;
+    return std::system("(command -v tshark && command -v text2pcap) >/dev/null 2>&1") == 0;
 }
 
 std::vector<TsharkFields> tsharkDecode(const std::vector<std::vector<std::uint8_t>>& datagrams) {
@@ -75,8 +54,11 @@ std::vector<TsharkFields> tsharkDecode(const std::vector<std::vector<std::uint8_
         throw std::runtime_error("cannot create a capture file");
     }
     close(descriptor);
-    std::ofstream(path, std::ios::binary) << captureFile(datagrams);
-    const std::string command = std::string("tshark -r ") + path + " -T pdml 2>/dev/null";
+    const std::string capture = std::string(path) + ".pcap";
+    std::ofstream(path) << hexDump(datagrams);
+    const std::string command = std::string("text2pcap -q -4 169.254.0.1,224.0.1.129 -u 320,320 ") +
+                                path + " " + capture + " && tshark -r " + capture +
+                                " -T pdml 2>/dev/null";
     std::unique_ptr<FILE, int (*)(FILE*)> pipe(popen(command.c_str(), "r"), pclose);
     std::vector<TsharkFields> packets;
     std::vector<std::string> open;  // the fields that enclose the current line
@@ -105,6 +87,7 @@ std::vector<TsharkFields> tsharkDecode(const std::vector<std::vector<std::uint8_
         line.clear();
     }
     std::remove(path);
+    std::remove(capture.c_str());
     return packets;
 }
 

@@ -15,11 +15,11 @@ namespace qvtest {
 // tshark found malformed.
 using TsharkFields = std::vector<std::pair<std::string, std::string>>;
 
-// Whether tshark is installed.
+// Whether tshark and text2pcap are installed.
 bool tsharkAvailable();
 
 // An independent decoding of PTP datagrams: all of them go into one capture file (UDP/IPv4
-// from 169.254.0.1 to 224.0.1.129, port 319 for event messages and 320 for the others) that
+// from 169.254.0.1 to 224.0.1.129, port 320: PTP decodes alike on either port) that
 // one tshark process dissects. Starting tshark takes about a second: decode in one batch.
 std::vector<TsharkFields> tsharkDecode(const std::vector<std::vector<std::uint8_t>>& datagrams);
 

@@ -37,20 +37,34 @@ std::string answerText(const tManagementMessagePayload& answer) {
            std::string(error->getDisplayData().view());
 }
 
+// The client's tests set and read single values, times, properties and descriptions; these
+// rows keep the octets of whole data sets, which the client only sees through getters, and
+// the refusals.
+void setUp(Clock& c) {
+    tStatus status;
+    c.defaultDataSet = {false, true, 0xC8, 0x21, 5, {}, c.defaultDataSet.clockIdentity};
+    c.defaultDataSet.clockQuality.clockAccuracy = 0x31;
+    c.timeProperties = {-1, true, false, true, true, false, true, 0xA0};
+    c.userDescription = tPTPText("rack4", status);
+    c.port(1).physicalLayerProtocol = tPTPText("IEEE 802.3", status);
+    c.port(1).physicalAddress = {2, 0, 0, 0, 0, 1};
+    c.port(2).logSyncInterval = -2;
+}
+
+// What a TLV writes is as long as its lengthField says, and even.
+void expectWhole(const tTLV& tlv) {
+    const std::size_t written = qvtest::hexOctets(qvtest::encode(tlv)).size();
+    EXPECT_EQ(written, tlv.getLengthField() + 4U);
+    EXPECT_EQ(written % 2, 0U);
+}
+
 const Row kRows[] = {
-    {"SET PRIORITY1", kSet, 1, "00 01 00 04 20 05 | C8 | 00", "00 01 00 04 20 05 C8 00"},
-    {"SET PRIORITY2", kSet, 1, "00 01 00 04 20 06 | 21 | 00", "00 01 00 04 20 06 21 00"},
-    {"SET SLAVE_ONLY", kSet, 1, "00 01 00 04 20 08 | 01 | 00", "00 01 00 04 20 08 01 00"},
-    {"SET DOMAIN", kSet, 1, "00 01 00 04 20 07 | 05 | 00", "00 01 00 04 20 07 05 00"},
     {"SET CLOCK_ACCURACY reserved", kSet, 1, "00 01 00 04 20 10 | 1F | 00",
-     "error 4 Unsupported clockAccuracy value"},
-    {"SET CLOCK_ACCURACY", kSet, 1, "00 01 00 04 20 10 | 31 | 00", "00 01 00 04 20 10 31 00"},
+     "error 4 Unsupported clockAccuracy value", setUp},
     // slaveOnly | numberPorts 2 | priority1 | quality | priority2 | identity | domain
     {"GET DEFAULT_DATA_SET", kGet, 1, "00 01 00 02 20 00",
      "00 01 00 16 20 00 02 00 00 02 C8 BB 31 FF FF 21 02 00 00 FF FE 00 00 01 05 00"},
     {"SET DEFAULT_DATA_SET", kSet, 1, "00 01 00 02 20 00", "error 6 Unsupported actionField"},
-    {"SET LOG_SYNC_INTERVAL port 2", kSet, 2, "00 01 00 04 20 0B | FE | 00",
-     "00 01 00 04 20 0B FE 00"},
     {"SET DELAY_MECHANISM reserved", kSet, 2, "00 01 00 04 60 00 | 03 | 00",
      "error 4 Unsupported delayMechanism value"},
     {"SET DELAY_MECHANISM disabled", kSet, 2, "00 01 00 04 60 00 | FE | 00",
@@ -62,45 +76,28 @@ const Row kRows[] = {
      "02"},
     {"GET PORT_DATA_SET of a port the clock lacks", kGet, 3, "00 01 00 02 20 04",
      "error 65534 Failure getting value"},
-    {"SET UTC_PROPERTIES", kSet, 1, "00 01 00 06 20 11 | FF FF | 05 | 00",
-     "00 01 00 06 20 11 FF FF 05 00"},
-    {"SET TRACEABILITY_PROPERTIES", kSet, 1, "00 01 00 04 20 12 | 10 | 00",
-     "00 01 00 04 20 12 10 00"},
     // An unknown time source is refused, and ptpTimescale is applied all the same.
     {"SET TIMESCALE_PROPERTIES unknown source", kSet, 1, "00 01 00 04 20 13 | 00 | 11",
      "error 4 Unknown timeSource value"},
     {"GET TIME_PROPERTIES_DATA_SET", kGet, 1, "00 01 00 02 20 03", "00 01 00 06 20 03 FF FF 15 A0"},
-    {"SET TIME", kSet, 1, "00 01 00 0C 20 0F | 00 00 00 00 03 E8 | 00 00 00 05",
-     "00 01 00 0C 20 0F 00 00 00 00 03 E8 00 00 00 05"},
-    {"GET TIME", kGet, 1, "00 01 00 0C 20 0F | 00 00 00 00 00 00 | 00 00 00 00",
-     "00 01 00 0C 20 0F 00 00 00 00 03 E8 00 00 00 05"},
     {"SET TIME on a clock that is not grandmaster", kSet, 1,
      "00 01 00 0C 20 0F | 00 00 00 00 07 D0 | 00 00 00 00",
      "error 6 Cannot set time on non-grandmaster clock",
      [](Clock& c) { c.parentDataSet.grandmasterIdentity = allOnesClockIdentity(); }},
-    {"SET USER_DESCRIPTION", kSet, 1, "00 01 00 08 00 02 | 05 72 61 63 6B 34",
-     "00 01 00 08 00 02 05 72 61 63 6B 34"},
     // clockType OC | "IEEE 802.3" | physical address | protocol address of no protocol |
     // manufacturer | reserved | product | revision | "rack4" | profile | pad
     {"GET CLOCK_DESCRIPTION", kGet, 1, "00 01 00 02 00 01",
      "00 01 00 2E 00 01 80 00 0A 49 45 45 45 20 38 30 32 2E 33 00 06 02 00 00 00 00 01 FF FE 00 00 "
-     "00 00 00 00 00 00 05 72 61 63 6B 34 00 00 00 00 00 00 00",
-     [](Clock& c) {
-         tStatus status;
-         c.port(1).physicalLayerProtocol = tPTPText("IEEE 802.3", status);
-         c.port(1).physicalAddress = {2, 0, 0, 0, 0, 1};
-     }},
+     "00 00 00 00 00 00 05 72 61 63 6B 34 00 00 00 00 00 00 00"},
     {"GET CLOCK_DESCRIPTION of a port the clock lacks", kGet, 3, "00 01 00 02 00 01",
      "error 65534 Failure getting value"},
     {"GET FAULT_LOG", kGet, 1,
      "00 01 00 14 00 06 | 00 01 | 00 0E | 00 00 00 00 00 05 00 00 00 07 | 07 | 00 00 00",
      "00 01 00 04 00 06 00 00"},
-    {"COMMAND DISABLE_PORT", kCommand, 2, "00 01 00 02 20 0E", "00 01 00 02 20 0E"},
     {"COMMAND INITIALIZE unknown key", kCommand, 1, "00 01 00 04 00 05 | 12 34",
      "error 4 Unknown initialization key value"},
     {"COMMAND SAVE_IN_NON_VOLATILE_STORAGE", kCommand, 1, "00 01 00 02 00 03",
      "error 6 Non-volatile storage is currently unsupported"},
-    {"COMMAND FAULT_LOG_RESET", kCommand, 1, "00 01 00 02 00 07", "00 01 00 02 00 07"},
     {"GET ENABLE_PORT", kGet, 1, "00 01 00 02 20 0D", "error 6 Unsupported actionField"},
     {"COMMAND PRIORITY2", kCommand, 1, "00 01 00 04 20 06 | 21 | 00",
      "error 6 Unsupported actionField"},
@@ -141,8 +138,8 @@ TEST(ResponderTest, AnswersInOrderAgainstOneClock) {
         ASSERT_TRUE(status.succeeded()) << status.code;
         ASSERT_NE(answer, nullptr);
         EXPECT_EQ(answerText(*answer), row.answer);
+        expectWhole(*answer);
     }
-    EXPECT_FALSE(clock.port(2).enabled);
     EXPECT_EQ(clock.defaultDataSet.priority2, 0x21);
 }
 
@@ -154,6 +151,8 @@ TEST(ResponderTest, EveryGetOfAFailingClockIsAGeneralError) {
         tStatus status;
         const auto answer = row.create()->respond(kGet, clock, 1, status);
         ASSERT_NE(answer, nullptr);
+        expectWhole(*row.create());
+        expectWhole(*answer);
         const std::string text = answerText(*answer);
         if (row.managementId == kNullManagement || row.managementId == kFaultLog) {
             EXPECT_EQ(text.find("error"), std::string::npos);    // the clock is not asked

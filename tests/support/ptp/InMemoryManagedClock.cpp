@@ -10,13 +10,17 @@ constexpr std::uint8_t kIdentity[tClockIdentity::kSize] = {0x02, 0x00, 0x00, 0xF
                                                            0xFE, 0x00, 0x00, 0x01};
 }
 
-InMemoryManagedClock::InMemoryManagedClock(std::uint16_t numberPorts) : ports(numberPorts) {
-    defaultDataSet.clockIdentity = tClockIdentity(kIdentity);
-    parentDataSet.parentPortIdentity = tPortIdentity(defaultDataSet.clockIdentity, 0);
-    parentDataSet.grandmasterIdentity = defaultDataSet.clockIdentity;
+InMemoryManagedClock::InMemoryManagedClock(std::uint16_t numberPorts)
+    : InMemoryManagedClock(numberPorts, tClockIdentity(kIdentity)) {}
+
+InMemoryManagedClock::InMemoryManagedClock(std::uint16_t numberPorts,
+                                           const tClockIdentity& identity)
+    : ports(numberPorts) {
+    defaultDataSet.clockIdentity = identity;
+    parentDataSet.parentPortIdentity = tPortIdentity(identity, 0);
+    parentDataSet.grandmasterIdentity = identity;
     for (std::uint16_t i = 0; i < numberPorts; ++i) {
-        ports[i].portIdentity =
-            tPortIdentity(defaultDataSet.clockIdentity, static_cast<std::uint16_t>(i + 1));
+        ports[i].portIdentity = tPortIdentity(identity, static_cast<std::uint16_t>(i + 1));
     }
 }
 
@@ -28,7 +32,7 @@ bool InMemoryManagedClock::proceed(Kind kind, tStatus& status) const {
                       (kind == Kind::setter && failures.setters) ||
                       (kind == Kind::command && failures.commands);
     if (fail) {
-        status.set(failures.failureCode, "inmemory", "InMemoryManagedClock", 0);
+        status.set(kStatusBadContent, "inmemory", "InMemoryManagedClock", 0);
         return false;
     }
     return true;

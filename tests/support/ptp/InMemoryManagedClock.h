@@ -74,17 +74,17 @@ class InMemoryManagedClock : public nQVPTP000::iManagedClock {
         bool enabled = true;
         unsigned initializations = 0;
     };
-    // Which operations fail, recording `failureCode`.
+    // Which operations fail, recording -52002.
     struct Failures {
         bool getters = false;
         bool setters = false;
         bool commands = false;
-        std::int32_t failureCode = kStatusBadContent;
     };
 
-    // A clock with identity 02-00-00-FF-FE-00-00-01 and ports 1 to `numberPorts`, each port
-    // identity naming the clock and its number.
+    // A clock with ports 1 to `numberPorts`, each port identity naming the clock and its
+    // number; its identity is 02-00-00-FF-FE-00-00-01 unless given.
     explicit InMemoryManagedClock(std::uint16_t numberPorts = 1);
+    InMemoryManagedClock(std::uint16_t numberPorts, const nQVPTP000::tClockIdentity& identity);
 
     DefaultDataSet defaultDataSet;
     CurrentDataSet currentDataSet;

@@ -53,14 +53,8 @@ std::unique_ptr<tManagementMessage> decodeManagement(const std::vector<std::uint
 
 SimulatedClock::SimulatedClock(const nQVPTP000::tClockIdentity& identity, std::uint16_t numberPorts,
                                std::uint8_t domainNumber)
-    : identity_(identity), numberPorts_(numberPorts), managed_(numberPorts) {
-    managed_.defaultDataSet.clockIdentity = identity;
+    : identity_(identity), numberPorts_(numberPorts), managed_(numberPorts, identity) {
     managed_.defaultDataSet.domainNumber = domainNumber;
-    managed_.parentDataSet.parentPortIdentity = tPortIdentity(identity, 0);
-    managed_.parentDataSet.grandmasterIdentity = identity;
-    for (std::uint16_t number = 1; number <= numberPorts; ++number) {
-        managed_.port(number).portIdentity = tPortIdentity(identity, number);
-    }
 }
 
 void SimulatedClock::setFault(Fault fault) {

@@ -30,14 +30,6 @@ void SimulatedNetwork::close(tStatus&) {
     wake();
 }
 
-void SimulatedNetwork::sendEventMessage(tProtocolDataUnit& unit, tStatus& status) {
-    send(unit, status);
-}
-
-void SimulatedNetwork::sendGeneralMessage(tProtocolDataUnit& unit, tStatus& status) {
-    send(unit, status);
-}
-
 // The clocks answer on the sending thread, outside the network's lock (each clock has its
 // own), so that exchanges with different clocks run side by side. Running out of memory is
 // reported as a transport would, with -52000.

@@ -30,8 +30,8 @@ class SimulatedNetwork final : public nQVPTP000::iPTPPortMessaging {
 
     void open(tStatus& status) override;
     void close(tStatus& status) override;
-    void sendEventMessage(nQVPTP000::tProtocolDataUnit& unit, tStatus& status) override;
-    void sendGeneralMessage(nQVPTP000::tProtocolDataUnit& unit, tStatus& status) override;
+    void sendEventMessage(nQVPTP000::tProtocolDataUnit& u, tStatus& s) override { send(u, s); }
+    void sendGeneralMessage(nQVPTP000::tProtocolDataUnit& u, tStatus& s) override { send(u, s); }
     void receive(nQVPTP000::tProtocolDataUnit& unit, tStatus& status) override;
     void abortReceive(tStatus& status) override;
     nQVPTP000::tPortAddress getPortAddress() override { return {}; }
