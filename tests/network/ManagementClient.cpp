@@ -61,10 +61,6 @@ std::string pmcClockIdentity(const std::array<std::uint8_t, 8>& identity) {
     return text;
 }
 
-std::string pmcPortIdentity(const TestClock& clock) {
-    return pmcClockIdentity(clock.identity) + "-" + std::to_string(clock.portNumber);
-}
-
 std::string describe(const tStatus& status) {
     return std::to_string(status.code) + " at " + status.file + ":" + std::to_string(status.line);
 }
@@ -77,7 +73,8 @@ std::map<std::string, std::string> pmcGet(const TestNetwork& network, const Test
     std::map<std::string, std::string> values;
     std::istringstream lines(result.output);
     std::string line;
-    const std::string head = pmcPortIdentity(clock) + " seq ";
+    const std::string head =
+        pmcClockIdentity(clock.identity) + "-" + std::to_string(clock.portNumber) + " seq ";
     bool inAnswer = false;
     while (std::getline(lines, line)) {
         if (line.rfind("\t\t", 0) != 0) {

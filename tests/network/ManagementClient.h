@@ -59,9 +59,8 @@ nQVPTPMGMT000::tClockKey clockKeyOf(const TestClock& clock);
 std::map<std::string, std::string> pmcGet(const TestNetwork& network, const TestClock& clock,
                                           const std::string& managementId, int domain = -1);
 
-// pmc's text of a port identity, "020000.fffe.000001-1"; of a clock identity without "-N".
+// pmc's text of a clock identity, "020000.fffe.000001".
 std::string pmcClockIdentity(const std::array<std::uint8_t, 8>& identity);
-std::string pmcPortIdentity(const TestClock& clock);
 
 // A status for a failure message: "-52012 at file.cpp:120".
 std::string describe(const tStatus& status);

@@ -44,25 +44,3 @@ TEST(BStrTest, CopyCarriesOctetLengthPrefixAndNul) {
     EXPECT_EQ(std::u16string(text), u"clock");
     BStr::release(text);
 }
-
-TEST(BStrTest, EmbeddedNulCountsAndNullIsTheEmptyString) {
-    const char16_t withNul[] = {u'a', u'\0', u'b'};
-    BSTR text = BStr::allocate(withNul, 3);
-    EXPECT_EQ(BStr::length(text), 3U);
-    EXPECT_EQ(text[2], u'b');
-    BStr::release(text);
-
-    EXPECT_EQ(BStr::allocate(nullptr), nullptr);
-    EXPECT_EQ(BStr::length(nullptr), 0U);
-    BStr::release(nullptr);
-
-    BSTR empty = BStr::allocate(u"");
-    ASSERT_NE(empty, nullptr);
-    EXPECT_EQ(BStr::length(empty), 0U);
-    BStr::release(empty);
-}
-
-TEST(BStrTest, LengthWhoseOctetCountOverflowsThrows) {
-    EXPECT_THROW(BStr::allocate(nullptr, 0x80000000u), qv::dsc::exception::OutOfRange);
-    EXPECT_THROW(BStr::allocate(nullptr, 0x7FFFFFFEu), qv::dsc::exception::OutOfRange);
-}

@@ -38,16 +38,6 @@ class SettingsTest : public ::testing::Test {
 
 }  // namespace
 
-TEST_F(SettingsTest, KeyPathBecomesAFolderUnderTheRoot) {
-    EXPECT_EQ(SettingsStore(FindClocksTimeout::kKeyPath).folder(),
-              root_ + "/Software/Quarvel/Corbel/qv-1588");
-    EXPECT_EQ(SettingsStore("..\\..\\etc").folder(), root_ + "/etc");
-}
-
-TEST_F(SettingsTest, AbsentValueGivesTheDefault) {
-    EXPECT_EQ(FindClocksTimeout::read(), 1000);
-}
-
 TEST_F(SettingsTest, StoredNumberIsUsedWithItsLow16Bits) {
     store("2500\n");
     EXPECT_EQ(FindClocksTimeout::read(), 2500);
@@ -71,9 +61,4 @@ TEST(EthernetAdaptersTest, ClockIdentityIsEui64OfTheAddress) {
     const EthernetAdapters::tClockIdentity expected = {0x02, 0x11, 0x22, 0xFF,
                                                        0xFE, 0x33, 0x44, 0x55};
     EXPECT_EQ(EthernetAdapters::clockIdentityOf(mac), expected);
-}
-
-TEST(EthernetAdaptersTest, NoAdapterGivesTheFixedIdentity) {
-    const EthernetAdapters::tClockIdentity expected = {'Q', 'V', 'P', 'T', 'P', 'C', 'L', 'K'};
-    EXPECT_EQ(EthernetAdapters::clockIdentityOf(std::nullopt), expected);
 }

@@ -1,63 +1,14 @@
 #include <gtest/gtest.h>
 
-#include <cstring>
 #include <string>
 
 #include "platform/CodePage.h"
 #include "platform/InvalidLocale.h"
-#include "platform/StringBase.h"
 #include "platform/WinError.h"
 
 using qv::dsc::CodePage;
-using qv::dsc::String;
-using qv::dsc::WString;
 using qv::dsc::exception::InvalidLocale;
 using qv::dsc::osdep::WinError;
-
-// A shorter text keeps the buffer while it fills at least half of it; otherwise the buffer
-// is replaced by one of exactly the new length.
-TEST(StringBaseTest, AssignmentKeepsOrReplacesTheBuffer) {
-    struct Case {
-        const char* before;
-        const char* after;
-        std::size_t capacity;
-        bool sameBuffer;
-    } const cases[] = {
-        {"0123456789abcdef", "0123456789", 16, true},                   // full enough
-        {"0123456789abcdef0123456789abcdef", "0123456789", 10, false},  // mostly empty
-        {"abc", "abcdefgh", 8, false},                                  // longer
-    };
-    for (const Case& c : cases) {
-        String text(c.before);
-        ASSERT_EQ(text.capacity(), std::strlen(c.before));
-        const char* before = text.c_str();
-        text = c.after;
-        EXPECT_EQ(text.c_str() == before, c.sameBuffer) << c.before;
-        EXPECT_EQ(text.capacity(), c.capacity) << c.before;
-        EXPECT_EQ(text.length(), std::strlen(c.after));
-        EXPECT_STREQ(text.c_str(), c.after);
-    }
-}
-
-TEST(StringBaseTest, NullEmptyCopyAndSelfAssignment) {
-    const String none(static_cast<const char*>(nullptr));
-    EXPECT_TRUE(none.empty());
-    EXPECT_STREQ(none.c_str(), "");
-    String text("clock");
-    const String copy(text);
-    EXPECT_NE(copy.c_str(), text.c_str());
-    EXPECT_EQ(copy, text);
-    text.assign(text.c_str() + 1, 3);  // a source inside its own buffer
-    EXPECT_STREQ(text.c_str(), "loc");
-    const char range[] = "xyz";
-    EXPECT_STREQ(String(range, range + 2).c_str(), "xy");
-}
-
-TEST(StringBaseTest, OtherWidthConvertsThroughTheCurrentLocale) {
-    const WString wide(String("PTP clock"));
-    EXPECT_EQ(std::u16string(wide.view()), u"PTP clock");
-    EXPECT_STREQ(String(wide).c_str(), "PTP clock");
-}
 
 TEST(CodePageTest, KnownNamesAreMatchedExactly) {
     EXPECT_EQ(CodePage::idOf(""), 0U);
@@ -89,11 +40,15 @@ TEST(CodePageTest, TextConvertsBothWaysAndUnrepresentableBecomesQuestionMark) {
     EXPECT_EQ(qv::dsc::AnsiToWide("", ""), u"");
 }
 
-TEST(CodePageTest, MalformedInputThrowsWinError) {
+TEST(CodePageTest, MalformedInputThrowsOnlyWhenStrict) {
     const char16_t loneSurrogate[] = {u'a', 0xD800, u'b'};
     EXPECT_THROW(qv::dsc::WideToAnsi(std::u16string_view(loneSurrogate, 3), "cp932"), WinError);
     // 0x81 opens a double-byte code that never comes.
     constexpr auto strict = qv::dsc::CodePage::tInvalidText::kThrow;
     EXPECT_THROW(qv::dsc::AnsiToWide("ab\x81", "cp932", strict), WinError);
     EXPECT_THROW(qv::dsc::AnsiToWide("\xC3", "US-ASCII", strict), WinError);
+    // Texts from clocks never fail a read: this program never calls setlocale, so "" is ASCII.
+    EXPECT_EQ(qv::dsc::AnsiToWide("caf\xC3\xA9", ""), u"caf\uFFFD\uFFFD");
+    // 0x81 0x20 is no double-byte code; the last 0x81 is cut short by the end.
+    EXPECT_EQ(qv::dsc::AnsiToWide("a\x81 b\x81", "cp932"), u"a\uFFFD b\uFFFD");
 }

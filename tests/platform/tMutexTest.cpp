@@ -7,18 +7,6 @@
 
 using nQVPTPMGMT000::nQVTARN000::tMutex;
 
-TEST(tMutexTest, UnlockWithoutLockIsHarmless) {
-    tStatus status;
-    tMutex mutex;
-    mutex.create(status);
-    ASSERT_TRUE(mutex.isCreated());
-    mutex.unlock(status);  // the usual path after an earlier error skipped the lock
-    mutex.lock(status);
-    mutex.unlock(status);
-    mutex.unlock(status);
-    EXPECT_EQ(status.code, 0);
-}
-
 TEST(tMutexTest, LockIsSkippedAfterAnError) {
     tStatus status;
     tMutex mutex;

@@ -70,11 +70,4 @@ TEST(tStatusTest, MergeFollowsTheRecordingRuleAndCopiesExtensions) {
     EXPECT_EQ(status.code, -52009);
 }
 
-TEST(tStatusTest, MacroRecordsFileWithoutDirectories) {
-    tStatus status;
-    QV_STATUS_SET(status, kStatusNoData, kComponentCodec);
-    EXPECT_STREQ(status.file, "tStatusTest.cpp");
-    EXPECT_STREQ(sourceBaseName("a\\b/c\\d.cpp"), "d.cpp");
-}
-
 }  // namespace

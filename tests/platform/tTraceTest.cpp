@@ -4,7 +4,6 @@
 
 #include <string>
 
-#include "platform/tConsoleTraceDestination.h"
 #include "tests/support/TraceCapture.h"
 
 using nQVTARN000::tTrace;
@@ -48,20 +47,6 @@ TEST_F(tTraceTest, HeaderFieldsAreJoinedPaddedAndCut) {
     EXPECT_EQ(destination.text(), std::string(49, ' ') + "x\n");
 }
 
-TEST_F(tTraceTest, LongPieceReachesDestinationInPiecesOf253) {
-    trace.append(std::string(600, 'a').c_str());
-    trace.endLine();
-    ASSERT_EQ(destination.pieces().size(), 3U);
-    EXPECT_EQ(destination.pieces()[0].size(), 253U);
-    EXPECT_EQ(destination.pieces()[1].size(), 253U);
-    EXPECT_EQ(destination.pieces()[2], std::string(94, 'a') + "\n");
-}
-
-TEST_F(tTraceTest, EachLineEndFinishesAPiece) {
-    trace.append("one\ntwo\n");
-    EXPECT_EQ(destination.pieces(), (std::vector<std::string>{"one\n", "two\n"}));
-}
-
 TEST_F(tTraceTest, OverlongFormattedTextIsAnnouncedAndCut) {
     const std::string big(2000, 'z');
     trace.appendFormatted("%s", big.c_str());
@@ -69,26 +54,6 @@ TEST_F(tTraceTest, OverlongFormattedTextIsAnnouncedAndCut) {
     const std::string text = destination.text();
     const std::string notice = "!!Formatted string exceeds kMaxTraceLine characters!!";
     EXPECT_EQ(text, notice + std::string(1023, 'z') + "\n");
-}
-
-TEST_F(tTraceTest, DisabledTraceAndSuppressedLineIgnoreAppends) {
-    trace.suppress().append("hidden").append(true);
-    trace.endLine();
-    trace.append("shown").endLine();
-    EXPECT_EQ(destination.text(), "\nshown\n");
-
-    destination.clear();
-    trace.setFlag(tTrace::Flag::enabled, false);
-    trace.beginLine("c", 1, "f", 0, 0).append("x").endLine();
-    EXPECT_TRUE(destination.pieces().empty());
-}
-
-TEST_F(tTraceTest, ValuesAppendInTheirFixedForms) {
-    trace.append(true).append(' ').append(false).append(' ');
-    trace.append(std::int32_t{-2147483647 - 1}).append(' ').append(std::int8_t{-5}).append(' ');
-    trace.append(std::uint16_t{65535}).append(' ').append(std::uint32_t{255}, 16);
-    trace.endLine();
-    EXPECT_EQ(destination.text(), "true(1) false(0) -2147483648 -5 65535 ff\n");
 }
 
 TEST_F(tTraceTest, NestingIndentsLinesBetweenOpenAndClose) {
@@ -103,19 +68,17 @@ TEST_F(tTraceTest, NestingIndentsLinesBetweenOpenAndClose) {
     EXPECT_EQ(destination.text(), "a\n  b\nc\nd\n");
 }
 
-TEST(tConsoleTraceDestinationTest, PiecesReachTheDebugOutput) {
-    qvtest::DebugOutputCapture capture;
-    nQVTARN000::tConsoleTraceDestination console;
-    console.write("abcdef", 3);
-    console.write("line\n");
-    EXPECT_EQ(capture.pieces(), (std::vector<std::string>{"abc", "line\n"}));
+// An object whose description traces a line of its own, inside a locked line.
+struct SelfTracing : nQVTARN000::iTraceable {
+    void trace(tTrace& trace) const override {
+        trace.beginLine("inner", 2, "b.cpp", 0, 0).append("inner").endLine();
+    }
+};
 
-    char buffer[8];
-    std::uint32_t needed = 0;
-    console.describe(buffer, sizeof(buffer), needed);
-    EXPECT_STREQ(buffer, " --dest");
-    EXPECT_EQ(needed, 20U);
-    EXPECT_STREQ(console.getName(), "nQVTARNS100_printf");
+TEST_F(tTraceTest, ALineBegunInsideALockedLineCompletes) {
+    trace.setFlag(tTrace::Flag::lockLines, true).setHeaderWidth(0);
+    trace.beginLine("outer", 1, "a.cpp", 0, 0).append(SelfTracing()).append("after").endLine();
+    EXPECT_EQ(destination.text(), "inner\nafter\n");
 }
 
 }  // namespace

@@ -1,6 +1,5 @@
 #include "tests/ptpmgmt/ClientTestSupport.h"
 
-#include <string>
 #include <thread>
 
 #include "ptp/TLVs/tNullManagementTLV.h"
@@ -46,11 +45,6 @@ std::unique_ptr<tManagementMessage> nullRequest(std::uint32_t actionField) {
     request->setPayload(std::make_unique<nQVPTP000::tNullManagementTLV>(), status);
     request->getHeader()->setSourcePortIdentity(clientPort(), status);
     return request;
-}
-
-bool isManagementComponent(const tStatus& status) {
-    return std::string(kComponentMgmt).compare(0, tStatus::kComponentSize - 1, status.component) ==
-           0;
 }
 
 bool discoverAll(nQVPTPMGMT000::tPTPMgmtNode& node, std::uint16_t count, tStatus& status) {

@@ -34,10 +34,6 @@ std::vector<std::uint8_t> answerOctets(std::uint16_t sequenceId,
 // A request message of NULL_MANAGEMENT to all ports of all clocks from the client.
 std::unique_ptr<nQVPTP000::tManagementMessage> nullRequest(std::uint32_t actionField);
 
-// Whether the status names the management client as the component that failed (as far as
-// the record's component field holds the name).
-bool isManagementComponent(const tStatus& status);
-
 // Discovers until the node knows `count` ports (at most 100 rounds of 20 ms): a single
 // short discovery may end before a loaded machine has run the receive thread.
 bool discoverAll(nQVPTPMGMT000::tPTPMgmtNode& node, std::uint16_t count, tStatus& status);
