@@ -11,10 +11,8 @@ namespace qvtest {
 // One namespace of the network that tools/testnet built: a PTP clock (ptp4l or ptpd) or a
 // bare endpoint (impl "none").
 struct TestClock {
-    int index = 0;                              // 1-based, in the order of the specs
     std::string impl;                           // "ptp4l", "ptpd" or "none"
     std::string nameSpace;                      // e.g. "q1a2b01-k1"
-    std::string address;                        // e.g. "169.254.1.1"
     std::string mac;                            // e.g. "02:00:00:00:00:01"
     std::array<std::uint8_t, 8> identity = {};  // EUI-64 of the MAC (FF FE inserted)
     std::uint16_t portNumber = 1;
@@ -42,7 +40,7 @@ CommandResult runCommand(const std::string& commandLine);
 class TestNetwork {
   public:
     explicit TestNetwork(const std::vector<std::string>& clockSpecs);
-    ~TestNetwork();
+    ~TestNetwork() { down(); }
     TestNetwork(const TestNetwork&) = delete;
     TestNetwork& operator=(const TestNetwork&) = delete;
 
@@ -64,11 +62,10 @@ class TestNetwork {
     void down();
 
     // Path of tools/testnet in the source tree.
-    static std::string toolPath();
+    static std::string toolPath() { return std::string(QV_SOURCE_DIR) + "/tools/testnet"; }
 
   private:
     bool parseLayout(const std::string& layout);
-    void readProcessIds();
 
     std::string prefix_;
     std::string clientNamespace_;
