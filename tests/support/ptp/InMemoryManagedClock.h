@@ -24,17 +24,15 @@ class InMemoryManagedClock : public nQVPTP000::iManagedClock {
     };
     struct CurrentDataSet {
         std::uint16_t stepsRemoved = 0;
-        nQVPTP000::tTimeInterval offsetFromMaster;
-        nQVPTP000::tTimeInterval meanPathDelay;
+        nQVPTP000::tTimeInterval offsetFromMaster, meanPathDelay;
     };
     struct ParentDataSet {
         nQVPTP000::tPortIdentity parentPortIdentity;
         bool parentStats = false;
         std::uint16_t observedParentOffsetScaledLogVariance = 0xFFFF;
         std::int32_t observedParentClockPhaseChangeRate = 0x7FFFFFFF;
-        std::uint8_t grandmasterPriority1 = 128;
+        std::uint8_t grandmasterPriority1 = 128, grandmasterPriority2 = 128;
         nQVPTP000::tClockIdentity grandmasterIdentity;
-        std::uint8_t grandmasterPriority2 = 128;
         nQVPTP000::tClockQuality grandmasterClockQuality;
     };
     struct TimePropertiesDataSet {

@@ -15,21 +15,15 @@ using nQVPTP000::tProtocolDataUnit;
 
 namespace qvtest {
 
-namespace {
-
 // Octets kept of an answer sent as garbage: the header and part of the body.
 constexpr std::size_t kGarbageLength = 40;
-
-}  // namespace
 
 std::vector<std::uint8_t> encodeMessage(const nQVPTP000::tPTPMessage& message) {
     tStatus status;
     tProtocolDataUnit unit(status);
     message.serialize(unit, status);
-    if (status.failed()) {
-        return {};
-    }
-    return {unit.getBuffer(), unit.getBuffer() + unit.getLength()};
+    const std::size_t length = status.failed() ? 0 : static_cast<std::size_t>(unit.getLength());
+    return {unit.getBuffer(), unit.getBuffer() + length};
 }
 
 std::unique_ptr<tManagementMessage> decodeManagement(const std::vector<std::uint8_t>& octets) {
