@@ -11,14 +11,12 @@ namespace qvtest {
 // One namespace of the network that tools/testnet built: a PTP clock (ptp4l or ptpd) or a
 // bare endpoint (impl "none").
 struct TestClock {
-    std::string impl;                           // "ptp4l", "ptpd" or "none"
-    std::string nameSpace;                      // e.g. "q1a2b01-k1"
-    std::string mac;                            // e.g. "02:00:00:00:00:01"
+    // The implementation ("ptp4l", "ptpd" or "none"), the namespace ("q1a2b01-k1"), the MAC
+    // ("02:00:00:00:00:01").
+    std::string impl, nameSpace, mac;
     std::array<std::uint8_t, 8> identity = {};  // EUI-64 of the MAC (FF FE inserted)
     std::uint16_t portNumber = 1;
-    std::uint8_t domain = 0;
-    std::uint8_t priority1 = 128;
-    std::uint8_t priority2 = 128;
+    std::uint8_t domain = 0, priority1 = 128, priority2 = 128;
     std::string description;  // the user description that the clock reports
 };
 
@@ -67,14 +65,10 @@ class TestNetwork {
   private:
     bool parseLayout(const std::string& layout);
 
-    std::string prefix_;
-    std::string clientNamespace_;
-    std::string clientAddress_;
+    std::string prefix_, clientNamespace_, clientAddress_, failure_;
     std::vector<TestClock> clocks_;
     std::vector<int> processIds_;
-    std::string failure_;
-    bool up_ = false;
-    bool started_ = false;
+    bool up_ = false, started_ = false;
 };
 
 }  // namespace qvtest

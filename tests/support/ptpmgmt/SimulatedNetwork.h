@@ -71,14 +71,12 @@ class SimulatedNetwork final : public nQVPTP000::iPTPPortMessaging {
 
     mutable std::mutex lock_;
     std::condition_variable changed_;
-    std::vector<SimulatedClock*> clocks_;          // guarded by lock_
-    std::vector<std::vector<std::uint8_t>> sent_;  // guarded by lock_
-    std::size_t sendsBeforeFailure_ = 0;           // guarded by lock_
-    std::size_t failingSends_ = 0;                 // guarded by lock_
+    std::vector<SimulatedClock*> clocks_;                    // guarded by lock_
+    std::vector<std::vector<std::uint8_t>> sent_;            // guarded by lock_
+    std::size_t sendsBeforeFailure_ = 0, failingSends_ = 0;  // guarded by lock_
     // Answers by due time, in arrival order among equal times; guarded by lock_.
     std::multimap<tClock::time_point, std::vector<std::uint8_t>> arrivals_;
-    std::atomic<bool> open_{false};
-    std::atomic<bool> abortRequested_{false};
+    std::atomic<bool> open_{false}, abortRequested_{false};
 };
 
 }  // namespace qvtest
