@@ -9,12 +9,10 @@
 namespace qvtest {
 
 // What the codec holds for a message, read through its getters and named as tshark names
-// the fields ("ptp.v2.mm.priority1"). Which getter answers which field is the one fact this
-// table states; the values themselves come from the message.
+// the fields ("ptp.v2.mm.priority1"): a sample of each TLV's fields, as the round trip of
+// every datagram holds the rest to their octets. Which getter answers which field is the one
+// fact this table states; the values themselves come from the message.
 TsharkFields fieldsAsTshark(const nQVPTP000::tPTPMessage& message);
-
-// tshark's fields that the codec does not model (reserved octets, pads, derived lengths).
-bool notModelled(const std::string& tsharkField);
 
 // One form for a value shown by tshark or by `fieldsAsTshark`: numbers (decimal, negative
 // or 0x-hex) as their 64-bit two's complement in decimal, anything else as it stands.

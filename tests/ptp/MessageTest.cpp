@@ -27,18 +27,6 @@ TEST(tManagementMessageTest, DefaultRequestOctets) {
             "00 01 | 00 02 | 00 00"));           // NULL_MANAGEMENT
 }
 
-TEST(tMessageHeaderTest, MessageTypeSetsControlField) {
-    const std::pair<std::uint32_t, std::uint8_t> cases[] = {{0x0, 0}, {0x1, 1}, {0x8, 2}, {0x9, 3},
-                                                            {0xD, 4}, {0xB, 5}, {0x2, 5}, {0xC, 5}};
-    for (const auto& [type, control] : cases) {
-        tMessageHeader header;
-        tStatus status;
-        header.setMessageType(type, status);
-        EXPECT_EQ(header.getMessageType(), type);
-        EXPECT_EQ(header.getControlField(), control) << type;
-    }
-}
-
 TEST(tManagementMessageTest, AssignCopiesHeaderAndTLVsButNotTheBody) {
     tStatus status;
     tManagementMessage source(status);

@@ -35,8 +35,4 @@ std::string hexText(const std::uint8_t* octets, std::size_t count) {
     return text;
 }
 
-std::string hexText(const std::vector<std::uint8_t>& octets) {
-    return hexText(octets.data(), octets.size());
-}
-
 }  // namespace qvtest

@@ -15,7 +15,9 @@ std::vector<std::uint8_t> hexOctets(std::string_view text);
 
 // Upper-case hex, one space between octets: "0B 02 00 36".
 std::string hexText(const std::uint8_t* octets, std::size_t count);
-std::string hexText(const std::vector<std::uint8_t>& octets);
+inline std::string hexText(const std::vector<std::uint8_t>& octets) {
+    return hexText(octets.data(), octets.size());
+}
 
 }  // namespace qvtest
 

@@ -9,31 +9,18 @@
 
 namespace qvtest {
 
-namespace {
-
-// The calling thread's own namespace link: /proc/self would name the main thread's.
-constexpr const char* kThreadNamespace = "/proc/thread-self/ns/net";
-
-}  // namespace
-
 NetworkNamespaceEntry::NetworkNamespaceEntry(const std::string& nameSpace) {
-    previous_ = open(kThreadNamespace, O_RDONLY | O_CLOEXEC);
-    if (previous_ < 0) {
-        failure_ = std::string("cannot open ") + kThreadNamespace + ": " + std::strerror(errno);
-        return;
-    }
+    // The calling thread's own namespace link: /proc/self would name the main thread's.
+    previous_ = open("/proc/thread-self/ns/net", O_RDONLY | O_CLOEXEC);
     const std::string path = "/run/netns/" + nameSpace;
-    const int target = open(path.c_str(), O_RDONLY | O_CLOEXEC);
-    if (target < 0) {
-        failure_ = "cannot open " + path + ": " + std::strerror(errno);
-        return;
+    const int target = previous_ < 0 ? -1 : open(path.c_str(), O_RDONLY | O_CLOEXEC);
+    entered_ = target >= 0 && setns(target, CLONE_NEWNET) == 0;
+    if (!entered_) {
+        failure_ = "cannot enter " + path + ": " + std::strerror(errno);
     }
-    if (setns(target, CLONE_NEWNET) == 0) {
-        entered_ = true;
-    } else {
-        failure_ = "setns " + path + ": " + std::strerror(errno);
+    if (target >= 0) {
+        close(target);
     }
-    close(target);
 }
 
 NetworkNamespaceEntry::~NetworkNamespaceEntry() {

@@ -30,42 +30,33 @@ std::string shellQuoted(const std::string& text) {
     return quoted + "'";
 }
 
+// The words "key=value" of a line of the tool's layout.
 std::map<std::string, std::string> layoutWords(const std::string& line) {
     std::map<std::string, std::string> words;
     std::istringstream in(line);
-    std::string word;
-    while (in >> word) {
-        const auto equals = word.find('=');
-        if (equals != std::string::npos) {
+    for (std::string word; in >> word;) {
+        if (const auto equals = word.find('='); equals != std::string::npos) {
             words[word.substr(0, equals)] = word.substr(equals + 1);
         }
     }
     return words;
 }
 
-bool parseIdentity(const std::string& hex, std::array<std::uint8_t, 8>& identity) {
-    if (hex.size() != 16) {
-        return false;
-    }
-    for (std::size_t i = 0; i < identity.size(); ++i) {
-        identity[i] = static_cast<std::uint8_t>(std::stoul(hex.substr(2 * i, 2), nullptr, 16));
-    }
-    return true;
-}
-
 TestClock clockOf(std::map<std::string, std::string>& words) {
-    TestClock clock;
-    clock.index = std::stoi(words["index"]);
-    clock.impl = words["impl"];
-    clock.nameSpace = words["ns"];
-    clock.address = words["addr"];
-    clock.mac = words["mac"];
-    parseIdentity(words["identity"], clock.identity);
-    clock.portNumber = static_cast<std::uint16_t>(std::stoul(words["port"]));
-    clock.domain = static_cast<std::uint8_t>(std::stoul(words["domain"]));
-    clock.priority1 = static_cast<std::uint8_t>(std::stoul(words["prio1"]));
-    clock.priority2 = static_cast<std::uint8_t>(std::stoul(words["prio2"]));
-    clock.description = words["desc"];
+    auto number = [&words](const char* key) { return std::stoul(words[key]); };
+    TestClock clock{words["impl"],
+                    words["ns"],
+                    words["mac"],
+                    {},
+                    static_cast<std::uint16_t>(number("port")),
+                    static_cast<std::uint8_t>(number("domain")),
+                    static_cast<std::uint8_t>(number("prio1")),
+                    static_cast<std::uint8_t>(number("prio2")),
+                    words["desc"]};
+    for (std::size_t i = 0; i < clock.identity.size() && words["identity"].size() == 16; ++i) {
+        clock.identity[i] =
+            static_cast<std::uint8_t>(std::stoul(words["identity"].substr(2 * i, 2), nullptr, 16));
+    }
     return clock;
 }
 
@@ -79,8 +70,7 @@ CommandResult runCommand(const std::string& commandLine) {
         return result;
     }
     char buffer[4096];
-    std::size_t count = 0;
-    while ((count = fread(buffer, 1, sizeof buffer, pipe)) > 0) {
+    for (std::size_t count; (count = fread(buffer, 1, sizeof buffer, pipe)) > 0;) {
         result.output.append(buffer, count);
     }
     const int status = pclose(pipe);
@@ -107,10 +97,6 @@ TestNetwork::TestNetwork(const std::vector<std::string>& clockSpecs) : prefix_(u
     }
 }
 
-TestNetwork::~TestNetwork() {
-    down();
-}
-
 void TestNetwork::down() {
     if (started_) {
         runCommand(shellQuoted(toolPath()) + " down " + prefix_);
@@ -124,14 +110,9 @@ CommandResult TestNetwork::runInClient(const std::string& commandLine) const {
                       shellQuoted(commandLine));
 }
 
-std::string TestNetwork::toolPath() {
-    return std::string(QV_SOURCE_DIR) + "/tools/testnet";
-}
-
 bool TestNetwork::parseLayout(const std::string& layout) {
     std::istringstream lines(layout);
-    std::string line;
-    while (std::getline(lines, line)) {
+    for (std::string line; std::getline(lines, line);) {
         auto words = layoutWords(line);
         if (line.rfind("client ", 0) == 0) {
             clientNamespace_ = words["ns"];

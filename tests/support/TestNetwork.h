@@ -11,16 +11,12 @@ namespace qvtest {
 // One namespace of the network that tools/testnet built: a PTP clock (ptp4l or ptpd) or a
 // bare endpoint (impl "none").
 struct TestClock {
-    int index = 0;                              // 1-based, in the order of the specs
-    std::string impl;                           // "ptp4l", "ptpd" or "none"
-    std::string nameSpace;                      // e.g. "q1a2b01-k1"
-    std::string address;                        // e.g. "169.254.1.1"
-    std::string mac;                            // e.g. "02:00:00:00:00:01"
+    // The implementation ("ptp4l", "ptpd" or "none"), the namespace ("q1a2b01-k1"), the MAC
+    // ("02:00:00:00:00:01").
+    std::string impl, nameSpace, mac;
     std::array<std::uint8_t, 8> identity = {};  // EUI-64 of the MAC (FF FE inserted)
     std::uint16_t portNumber = 1;
-    std::uint8_t domain = 0;
-    std::uint8_t priority1 = 128;
-    std::uint8_t priority2 = 128;
+    std::uint8_t domain = 0, priority1 = 128, priority2 = 128;
     std::string description;  // the user description that the clock reports
 };
 
@@ -42,7 +38,7 @@ CommandResult runCommand(const std::string& commandLine);
 class TestNetwork {
   public:
     explicit TestNetwork(const std::vector<std::string>& clockSpecs);
-    ~TestNetwork();
+    ~TestNetwork() { down(); }
     TestNetwork(const TestNetwork&) = delete;
     TestNetwork& operator=(const TestNetwork&) = delete;
 
@@ -64,20 +60,15 @@ class TestNetwork {
     void down();
 
     // Path of tools/testnet in the source tree.
-    static std::string toolPath();
+    static std::string toolPath() { return std::string(QV_SOURCE_DIR) + "/tools/testnet"; }
 
   private:
     bool parseLayout(const std::string& layout);
-    void readProcessIds();
 
-    std::string prefix_;
-    std::string clientNamespace_;
-    std::string clientAddress_;
+    std::string prefix_, clientNamespace_, clientAddress_, failure_;
     std::vector<TestClock> clocks_;
     std::vector<int> processIds_;
-    std::string failure_;
-    bool up_ = false;
-    bool started_ = false;
+    bool up_ = false, started_ = false;
 };
 
 }  // namespace qvtest

@@ -9,16 +9,19 @@
 
 namespace qvtest {
 
+// The pieces one after another.
+std::string joined(const std::vector<std::string>& pieces);
+
 // Collects what reaches the debug output while alive.
 class DebugOutputCapture {
   public:
     DebugOutputCapture();
-    ~DebugOutputCapture();
+    ~DebugOutputCapture() { nQVTARN000::setDebugOutputSink(previous_); }
     DebugOutputCapture(const DebugOutputCapture&) = delete;
     DebugOutputCapture& operator=(const DebugOutputCapture&) = delete;
 
     const std::vector<std::string>& pieces() const { return pieces_; }
-    std::string text() const;
+    std::string text() const { return joined(pieces_); }
 
   private:
     static void collect(const char* text, void* context);
@@ -34,7 +37,7 @@ class RecordingDestination final : public nQVTARN000::iTraceDestination {
     }
     void write(const char* text) override { pieces_.emplace_back(text); }
     const std::vector<std::string>& pieces() const { return pieces_; }
-    std::string text() const;
+    std::string text() const { return joined(pieces_); }
     void clear() { pieces_.clear(); }
 
   private:

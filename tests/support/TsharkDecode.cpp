@@ -5,10 +5,11 @@
 #include <cstdio>
 #include <cstdlib>
 #include <fstream>
-#include <memory>
+#include <sstream>
 #include <stdexcept>
 
 #include "tests/support/Hex.h"
+#include "tests/support/TestNetwork.h"
 
 namespace qvtest {
 
@@ -32,15 +33,6 @@ std::string attribute(const std::string& line, const std::string& name) {
     return text;
 }
 
-// A hex dump that text2pcap makes a capture file of: one datagram per line.
-std::string hexDump(const std::vector<std::vector<std::uint8_t>>& datagrams) {
-    std::string dump;
-    for (const auto& datagram : datagrams) {
-        dump += "000000 " + hexText(datagram) + "\n";
-    }
-    return dump;
-}
-
 }  // namespace
 
 bool tsharkAvailable() {
@@ -55,19 +47,21 @@ std::vector<TsharkFields> tsharkDecode(const std::vector<std::vector<std::uint8_
     }
     close(descriptor);
     const std::string capture = std::string(path) + ".pcap";
-    std::ofstream(path) << hexDump(datagrams);
-    const std::string command = std::string("text2pcap -q -4 169.254.0.1,224.0.1.129 -u 320,320 ") +
-                                path + " " + capture + " && tshark -r " + capture +
-                                " -T pdml 2>/dev/null";
-    std::unique_ptr<FILE, int (*)(FILE*)> pipe(popen(command.c_str(), "r"), pclose);
+    {
+        std::ofstream dump(path);  // a hex dump for text2pcap: one datagram per line
+        for (const auto& datagram : datagrams) {
+            dump << "000000 " << hexText(datagram) << "\n";
+        }
+    }
+    std::istringstream pdml(
+        runCommand(std::string("text2pcap -q -4 169.254.0.1,224.0.1.129 -u 320,320 ") + path + " " +
+                   capture + " && tshark -r " + capture + " -T pdml")
+            .output);
+    std::remove(path);
+    std::remove(capture.c_str());
     std::vector<TsharkFields> packets;
     std::vector<std::string> open;  // the fields that enclose the current line
-    std::string line;
-    for (int c = 0; pipe && (c = std::fgetc(pipe.get())) != EOF;) {
-        if (c != '\n') {
-            line += static_cast<char>(c);
-            continue;
-        }
+    for (std::string line; std::getline(pdml, line);) {
         const std::string name = attribute(line, "name");
         if (line.find("<packet>") != std::string::npos) {
             packets.emplace_back();
@@ -84,10 +78,7 @@ std::vector<TsharkFields> tsharkDecode(const std::vector<std::vector<std::uint8_
                 open.push_back(name);
             }
         }
-        line.clear();
     }
-    std::remove(path);
-    std::remove(capture.c_str());
     return packets;
 }
 

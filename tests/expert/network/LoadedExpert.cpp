@@ -31,14 +31,11 @@ std::map<std::string, std::string> pmcValues(const TestNetwork& network, const T
         "pmc -4 -i br0 -b 0 -d " + std::to_string(clock.domain) + " 'GET " + managementId + "'");
     std::map<std::string, std::string> values;
     std::istringstream lines(result.output);
-    std::string line;
-    while (std::getline(lines, line)) {
-        if (line.rfind("\t\t", 0) == 0) {
-            std::istringstream words(line);
-            std::string name;
-            std::string value;
-            words >> name;
-            std::getline(words >> std::ws, value);
+    for (std::string line; std::getline(lines, line);) {
+        std::istringstream words(line);
+        std::string name;
+        std::string value;
+        if (line.starts_with("\t\t") && words >> name && std::getline(words >> std::ws, value)) {
             values[name] = value.substr(0, value.find_last_not_of(' ') + 1);
         }
     }

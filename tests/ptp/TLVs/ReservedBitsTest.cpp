@@ -14,9 +14,7 @@ TEST(ReservedBitsTest, IgnoredWhenReadAndWrittenAsZero) {
     const std::pair<const char*, const char*> rows[] = {
         // received | written
         {"00 01 00 04 20 05 | C8 | 77", "00 01 00 04 20 05 | C8 | 00"},  // PRIORITY1
-        {"00 01 00 04 20 08 | FF | 00", "00 01 00 04 20 08 | 01 | 00"},  // SLAVE_ONLY
         {"00 01 00 04 20 0C | F2 | 00", "00 01 00 04 20 0C | 02 | 00"},  // VERSION_NUMBER
-        {"00 01 00 04 20 12 | FF | 00", "00 01 00 04 20 12 | 30 | 00"},  // TRACEABILITY_PROPERTIES
         {"00 01 00 04 20 13 | FF | A0", "00 01 00 04 20 13 | 08 | A0"},  // TIMESCALE_PROPERTIES
         {"00 01 00 06 20 11 | 00 25 | FF | 00", "00 01 00 06 20 11 | 00 25 | 07 | 00"},
         {"00 01 00 06 20 03 | FF FE | FF | 20", "00 01 00 06 20 03 | FF FE | 3F | 20"},
@@ -25,16 +23,6 @@ TEST(ReservedBitsTest, IgnoredWhenReadAndWrittenAsZero) {
          "00 | 66",
          "00 01 00 16 20 00 | 03 | 00 | 00 01 | 80 | F8 FE FF FF | 80 | 01 02 03 04 05 06 07 08 |"
          "00 | 00"},
-        // PARENT_DATA_SET: parentStats and the reserved octet after it
-        {"00 01 00 22 20 02 | 01 02 03 04 05 06 07 08 00 03 | FF | 77 | FF FF | 7F FF FF FF | 80 |"
-         "F8 FE FF FF | 80 | 01 02 03 04 05 06 07 08",
-         "00 01 00 22 20 02 | 01 02 03 04 05 06 07 08 00 03 | 01 | 00 | FF FF | 7F FF FF FF | 80 |"
-         "F8 FE FF FF | 80 | 01 02 03 04 05 06 07 08"},
-        // PORT_DATA_SET: the reserved nibble before versionNumber
-        {"00 01 00 1C 20 04 | 02 00 00 FF FE 00 00 01 00 02 | 06 | FD | 00 00 00 00 00 00 00 00 |"
-         "FE | 03 | FF | 02 | 01 | F2",
-         "00 01 00 1C 20 04 | 02 00 00 FF FE 00 00 01 00 02 | 06 | FD | 00 00 00 00 00 00 00 00 |"
-         "FE | 03 | FF | 02 | 01 | 02"},
         // FAULT_LOG: a record 2 octets longer than its fields; they are skipped
         {"00 01 00 16 00 06 | 00 01 | 00 10 | 00 00 00 00 00 00 00 00 00 00 | 07 | 00 00 00 |"
          "AB CD",

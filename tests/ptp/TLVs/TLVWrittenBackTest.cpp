@@ -22,8 +22,6 @@ std::string response(std::string_view length) {
 const std::pair<std::string, std::string> kCases[] = {
     {response("3A") + "00 01 00 06 20 05 | C8 00 | AA BB",  // PRIORITY1
      response("38") + "00 01 00 04 20 05 | C8 00"},
-    {response("44") + "00 02 00 10 | 00 02 20 00 00 00 00 00 | 03 61 62 63 | 00 00 00 00",
-     response("40") + "00 02 00 0C | 00 02 20 00 00 00 00 00 | 03 61 62 63"},
     // An error status that the datagram's end cuts inside its text keeps its refusal.
     {response("44") + "00 02 00 10 | 00 02 20 00 00 00 00 00 | 03 61",
      response("3E") + "00 02 00 0A | 00 02 20 00 00 00 00 00 | 00 00"},

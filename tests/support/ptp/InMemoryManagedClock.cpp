@@ -25,17 +25,13 @@ InMemoryManagedClock::InMemoryManagedClock(std::uint16_t numberPorts,
 }
 
 bool InMemoryManagedClock::proceed(Kind kind, tStatus& status) const {
-    if (status.failed()) {
-        return false;
-    }
     const bool fail = (kind == Kind::getter && failures.getters) ||
                       (kind == Kind::setter && failures.setters) ||
                       (kind == Kind::command && failures.commands);
-    if (fail) {
+    if (fail && status.succeeded()) {
         status.set(kStatusBadContent, "inmemory", "InMemoryManagedClock", 0);
-        return false;
     }
-    return true;
+    return status.succeeded();
 }
 
 InMemoryManagedClock::Port* InMemoryManagedClock::find(Kind kind, std::uint16_t port,
@@ -58,14 +54,10 @@ std::span<const std::uint8_t> InMemoryManagedClock::getPhysicalAddress(std::uint
 }
 
 void InMemoryManagedClock::enablePort(std::uint16_t port, tStatus& status) {
-    if (Port* found = find(Kind::command, port, status); found != nullptr) {
-        found->enabled = true;
-    }
+    writePort(port, &Port::enabled, true, status, Kind::command);
 }
 void InMemoryManagedClock::disablePort(std::uint16_t port, tStatus& status) {
-    if (Port* found = find(Kind::command, port, status); found != nullptr) {
-        found->enabled = false;
-    }
+    writePort(port, &Port::enabled, false, status, Kind::command);
 }
 void InMemoryManagedClock::initialize(std::uint16_t port, tStatus& status) {
     if (Port* found = find(Kind::command, port, status); found != nullptr) {

@@ -17,58 +17,44 @@ class InMemoryManagedClock : public nQVPTP000::iManagedClock {
     using Manufacturer = std::array<std::uint8_t, 3>;
     using Profile = std::array<std::uint8_t, 6>;
     struct DefaultDataSet {
-        bool twoStepFlag = false;
-        bool slaveOnly = false;
-        std::uint8_t priority1 = 128;
-        std::uint8_t priority2 = 128;
-        std::uint8_t domainNumber = 0;
+        bool twoStepFlag = false, slaveOnly = false;
+        std::uint8_t priority1 = 128, priority2 = 128, domainNumber = 0;
         nQVPTP000::tClockQuality clockQuality;
         nQVPTP000::tClockIdentity clockIdentity;
     };
     struct CurrentDataSet {
         std::uint16_t stepsRemoved = 0;
-        nQVPTP000::tTimeInterval offsetFromMaster;
-        nQVPTP000::tTimeInterval meanPathDelay;
+        nQVPTP000::tTimeInterval offsetFromMaster, meanPathDelay;
     };
     struct ParentDataSet {
         nQVPTP000::tPortIdentity parentPortIdentity;
         bool parentStats = false;
         std::uint16_t observedParentOffsetScaledLogVariance = 0xFFFF;
         std::int32_t observedParentClockPhaseChangeRate = 0x7FFFFFFF;
-        std::uint8_t grandmasterPriority1 = 128;
+        std::uint8_t grandmasterPriority1 = 128, grandmasterPriority2 = 128;
         nQVPTP000::tClockIdentity grandmasterIdentity;
-        std::uint8_t grandmasterPriority2 = 128;
         nQVPTP000::tClockQuality grandmasterClockQuality;
     };
     struct TimePropertiesDataSet {
         std::int16_t currentUtcOffset = 37;
-        bool currentUtcOffsetValid = false;
-        bool leap59 = false;
-        bool leap61 = false;
-        bool timeTraceable = false;
-        bool frequencyTraceable = false;
-        bool ptpTimescale = true;
+        bool currentUtcOffsetValid = false, leap59 = false, leap61 = false, timeTraceable = false,
+             frequencyTraceable = false, ptpTimescale = true;
         std::uint8_t timeSource = 0xA0;
     };
     struct Port {
         nQVPTP000::tPortIdentity portIdentity;
-        std::uint8_t portState = 1;
-        std::int8_t logMinDelayReqInterval = 0;
         nQVPTP000::tTimeInterval peerMeanPathDelay;
-        std::int8_t logAnnounceInterval = 1;
-        std::uint8_t announceReceiptTimeout = 3;
-        std::int8_t logSyncInterval = 0;
-        std::uint8_t delayMechanism = 1;
-        std::int8_t logMinPdelayReqInterval = 0;
-        std::uint8_t versionNumber = 2;
+        std::uint8_t portState = 1, announceReceiptTimeout = 3, delayMechanism = 1,
+                     versionNumber = 2;
+        std::int8_t logMinDelayReqInterval = 0, logAnnounceInterval = 1, logSyncInterval = 0,
+                    logMinPdelayReqInterval = 0;
         // Clock description as seen through this port.
         std::uint16_t clockType = 0x8000;
         nQVPTP000::tPTPText physicalLayerProtocol;
         std::vector<std::uint8_t> physicalAddress;
         nQVPTP000::tPortAddress protocolAddress;
         Manufacturer manufacturerIdentity{};
-        nQVPTP000::tPTPText productDescription;
-        nQVPTP000::tPTPText revisionData;
+        nQVPTP000::tPTPText productDescription, revisionData;
         Profile profileIdentity{};
         // Commands.
         bool enabled = true;
@@ -76,9 +62,7 @@ class InMemoryManagedClock : public nQVPTP000::iManagedClock {
     };
     // Which operations fail, recording -52002.
     struct Failures {
-        bool getters = false;
-        bool setters = false;
-        bool commands = false;
+        bool getters = false, setters = false, commands = false;
     };
 
     // A clock with ports 1 to `numberPorts`, each port identity naming the clock and its
@@ -99,24 +83,16 @@ class InMemoryManagedClock : public nQVPTP000::iManagedClock {
     Port& port(std::uint16_t number) { return ports.at(number - 1U); }
 
     // One row per member that the clock reads, or reads and writes.
-#define QV_GET(Type, Name, member)        \
-    Type get##Name(tStatus& s) override { \
-        return read(member, s);           \
-    }
-#define QV_GET_SET(Type, Name, member)            \
-    QV_GET(Type, Name, member)                    \
-    void set##Name(Type v, tStatus& s) override { \
-        write(member, v, s);                      \
-    }
-#define QV_PORT_GET(Type, Name, member)                    \
-    Type get##Name(std::uint16_t p, tStatus& s) override { \
-        return readPort(p, &Port::member, s);              \
-    }
-#define QV_PORT_GET_SET(Type, Name, member)                        \
-    QV_PORT_GET(Type, Name, member)                                \
+// clang-format off
+#define QV_GET(Type, Name, member) Type get##Name(tStatus& s) override { return read(member, s); }
+#define QV_GET_SET(Type, Name, member) QV_GET(Type, Name, member) \
+    void set##Name(Type v, tStatus& s) override { write(member, v, s); }
+#define QV_PORT_GET(Type, Name, member) \
+    Type get##Name(std::uint16_t p, tStatus& s) override { return readPort(p, &Port::member, s); }
+#define QV_PORT_GET_SET(Type, Name, member) QV_PORT_GET(Type, Name, member) \
     void set##Name(std::uint16_t p, Type v, tStatus& s) override { \
-        writePort(p, &Port::member, v, s);                         \
-    }
+        writePort(p, &Port::member, v, s); }
+    // clang-format on
     QV_GET(bool, TwoStepFlag, defaultDataSet.twoStepFlag)
     QV_GET_SET(bool, SlaveOnly, defaultDataSet.slaveOnly)
     QV_GET_SET(std::uint8_t, Priority1, defaultDataSet.priority1)
@@ -175,13 +151,13 @@ class InMemoryManagedClock : public nQVPTP000::iManagedClock {
     void setClockAccuracy(std::uint8_t a, tStatus& s) override {
         write(defaultDataSet.clockQuality.clockAccuracy, std::uint32_t{a}, s);
     }
-    std::span<const std::uint8_t> getPhysicalAddress(std::uint16_t port, tStatus& status) override;
     void setUserDescription(const nQVPTP000::tPTPText& t, tStatus& s) override {
         write(userDescription, t, s);
     }
     void setTime(const nQVPTP000::tTimestamp& t, tStatus& s) override {
         write(time, t, s);
     }
+    std::span<const std::uint8_t> getPhysicalAddress(std::uint16_t port, tStatus& status) override;
     void enablePort(std::uint16_t port, tStatus& status) override;
     void disablePort(std::uint16_t port, tStatus& status) override;
     void initialize(std::uint16_t port, tStatus& status) override;
@@ -211,8 +187,9 @@ class InMemoryManagedClock : public nQVPTP000::iManagedClock {
         return found != nullptr ? found->*member : T{};
     }
     template <typename T>
-    void writePort(std::uint16_t port, T Port::*member, const T& value, tStatus& status) {
-        if (Port* found = find(Kind::setter, port, status); found != nullptr) {
+    void writePort(std::uint16_t port, T Port::*member, const T& value, tStatus& status,
+                   Kind kind = Kind::setter) {
+        if (Port* found = find(kind, port, status); found != nullptr) {
             found->*member = value;
         }
     }

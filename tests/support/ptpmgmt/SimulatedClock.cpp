@@ -15,37 +15,23 @@ using nQVPTP000::tProtocolDataUnit;
 
 namespace qvtest {
 
-namespace {
-
 // Octets kept of an answer sent as garbage: the header and part of the body.
 constexpr std::size_t kGarbageLength = 40;
-
-std::uint32_t answerAction(std::uint32_t requestAction, bool swapped) {
-    const bool command = requestAction == tManagementMessagePayload::kCommand;
-    return command != swapped ? tManagementMessagePayload::kAcknowledge
-                              : tManagementMessagePayload::kResponse;
-}
-
-}  // namespace
 
 std::vector<std::uint8_t> encodeMessage(const nQVPTP000::tPTPMessage& message) {
     tStatus status;
     tProtocolDataUnit unit(status);
     message.serialize(unit, status);
-    if (status.failed()) {
-        return {};
-    }
-    return {unit.getBuffer(), unit.getBuffer() + unit.getLength()};
+    const std::size_t length = status.failed() ? 0 : static_cast<std::size_t>(unit.getLength());
+    return {unit.getBuffer(), unit.getBuffer() + length};
 }
 
 std::unique_ptr<tManagementMessage> decodeManagement(const std::vector<std::uint8_t>& octets) {
     tStatus status;
     tProtocolDataUnit unit(status);
     unit.writeOctets(octets.data(), octets.size(), status);
-    std::unique_ptr<nQVPTP000::tPTPMessage> message =
-        nQVPTP000::tPTPMessageFactory::createMessage(unit, status);
-    if (status.failed() || !message || message->getHeader() == nullptr ||
-        message->getHeader()->getMessageType() != tMessageHeader::kManagement) {
+    auto message = nQVPTP000::tPTPMessageFactory::createMessage(unit, status);
+    if (dynamic_cast<tManagementMessage*>(message.get()) == nullptr) {
         return nullptr;
     }
     return std::unique_ptr<tManagementMessage>(static_cast<tManagementMessage*>(message.release()));
@@ -57,21 +43,6 @@ SimulatedClock::SimulatedClock(const nQVPTP000::tClockIdentity& identity, std::u
     managed_.defaultDataSet.domainNumber = domainNumber;
 }
 
-void SimulatedClock::setFault(Fault fault) {
-    std::lock_guard<std::mutex> guard(lock_);
-    fault_ = fault;
-}
-
-void SimulatedClock::setDelay(std::chrono::milliseconds delay) {
-    std::lock_guard<std::mutex> guard(lock_);
-    delay_ = delay;
-}
-
-std::uint64_t SimulatedClock::requestsSeen() const {
-    std::lock_guard<std::mutex> guard(lock_);
-    return requestsSeen_;
-}
-
 std::vector<SimulatedAnswer> SimulatedClock::answer(const std::uint8_t* octets,
                                                     std::size_t length) {
     std::unique_ptr<tManagementMessage> request =
@@ -81,16 +52,12 @@ std::vector<SimulatedAnswer> SimulatedClock::answer(const std::uint8_t* octets,
     if (!request || !addressedToUs(*request)) {
         return answers;
     }
-    ++requestsSeen_;
     if (fault_ == Fault::silent) {
         return answers;
     }
     const std::uint16_t target = request->getTargetPortIdentity().getPortNumber();
-    if (target != tPortIdentity::kAllPorts) {
-        answerAsPort(*request, target, answers);
-        return answers;
-    }
-    for (std::uint16_t port = 1; port <= numberPorts_; ++port) {
+    const bool all = target == tPortIdentity::kAllPorts;
+    for (std::uint16_t port = all ? 1 : target; port <= (all ? numberPorts_ : target); ++port) {
         answerAsPort(*request, port, answers);
     }
     return answers;
@@ -100,20 +67,14 @@ std::vector<SimulatedAnswer> SimulatedClock::answer(const std::uint8_t* octets,
 // its ports (or all ports).
 bool SimulatedClock::addressedToUs(const tManagementMessage& request) const {
     const std::uint32_t action = request.getActionField();
-    if (action != tManagementMessagePayload::kGet && action != tManagementMessagePayload::kSet &&
-        action != tManagementMessagePayload::kCommand) {
-        return false;
-    }
-    if (request.getHeader()->getDomainNumber() != managed_.defaultDataSet.domainNumber) {
-        return false;
-    }
     const tPortIdentity target = request.getTargetPortIdentity();
-    const bool clockMatches = target.getClockIdentity() == identity_ ||
-                              target.getClockIdentity() == nQVPTP000::allOnesClockIdentity();
     const std::uint16_t port = target.getPortNumber();
-    const bool portMatches =
-        port == tPortIdentity::kAllPorts || (port >= 1 && port <= numberPorts_);
-    return clockMatches && portMatches;
+    return action != tManagementMessagePayload::kResponse &&
+           action <= tManagementMessagePayload::kCommand &&
+           request.getHeader()->getDomainNumber() == managed_.defaultDataSet.domainNumber &&
+           (target.getClockIdentity() == identity_ ||
+            target.getClockIdentity() == nQVPTP000::allOnesClockIdentity()) &&
+           (port == tPortIdentity::kAllPorts || (port >= 1 && port <= numberPorts_));
 }
 
 std::unique_ptr<tManagementMessagePayload> SimulatedClock::payloadFor(tManagementMessage& request,
@@ -144,7 +105,10 @@ void SimulatedClock::answerAsPort(tManagementMessage& request, std::uint16_t por
     tStatus status;
     std::unique_ptr<tManagementMessagePayload> payload = payloadFor(request, port, status);
     tManagementMessage reply(status);
-    reply.setActionField(answerAction(request.getActionField(), fault_ == Fault::wrongAction),
+    const bool command = request.getActionField() == tManagementMessagePayload::kCommand;
+    reply.setActionField(command != (fault_ == Fault::wrongAction)
+                             ? tManagementMessagePayload::kAcknowledge
+                             : tManagementMessagePayload::kResponse,
                          status);
     tPortIdentity target = request.getHeader()->getSourcePortIdentity();
     if (fault_ == Fault::wrongTargetPort) {

@@ -53,9 +53,15 @@ class SimulatedClock {
     // The answers to one received datagram (none for anything but a request to this clock).
     std::vector<SimulatedAnswer> answer(const std::uint8_t* octets, std::size_t length);
 
-    void setFault(Fault fault);
+    void setFault(Fault fault) {
+        std::lock_guard<std::mutex> guard(lock_);
+        fault_ = fault;
+    }
     // Every answer goes out this long after the request.
-    void setDelay(std::chrono::milliseconds delay);
+    void setDelay(std::chrono::milliseconds delay) {
+        std::lock_guard<std::mutex> guard(lock_);
+        delay_ = delay;
+    }
 
     // Runs `change` on the managed clock under the clock's lock.
     template <typename Change>
@@ -75,9 +81,6 @@ class SimulatedClock {
     InMemoryManagedClock& managed() { return managed_; }
 
     const nQVPTP000::tClockIdentity& identity() const { return identity_; }
-    std::uint16_t numberPorts() const { return numberPorts_; }
-    // Requests addressed to this clock in its domain, answered or not.
-    std::uint64_t requestsSeen() const;
 
   private:
     bool addressedToUs(const nQVPTP000::tManagementMessage& request) const;
@@ -92,7 +95,6 @@ class SimulatedClock {
     InMemoryManagedClock managed_;  // guarded by lock_
     Fault fault_ = Fault::none;
     std::chrono::milliseconds delay_{0};
-    std::uint64_t requestsSeen_ = 0;
 };
 
 // The octets of a message as it goes on the wire (empty when it cannot be encoded).

@@ -8,26 +8,11 @@ using nQVPTP000::tProtocolDataUnit;
 
 namespace qvtest {
 
-namespace {
-constexpr const char* kComponent = "simnet";
-constexpr const char* kFile = "SimulatedNetwork";
-}  // namespace
-
-void SimulatedNetwork::attach(SimulatedClock& clock) {
-    std::lock_guard<std::mutex> guard(lock_);
-    clocks_.push_back(&clock);
-}
-
 void SimulatedNetwork::open(tStatus& status) {
     if (status.succeeded()) {
         abortRequested_.store(false);
         open_.store(true);
     }
-}
-
-void SimulatedNetwork::close(tStatus&) {
-    open_.store(false);
-    wake();
 }
 
 // The clocks answer on the sending thread, outside the network's lock (each clock has its
@@ -47,7 +32,7 @@ void SimulatedNetwork::send(tProtocolDataUnit& unit, tStatus& status) {
             const bool fails = failingSends_ > 0 && sendsBeforeFailure_ == 0;
             if (!open_.load() || fails) {
                 failingSends_ -= fails ? 1 : 0;
-                status.set(kStatusSocketError, kComponent, kFile, __LINE__);
+                status.set(kStatusSocketError, "simnet", "SimulatedNetwork", __LINE__);
                 return;
             }
             sendsBeforeFailure_ -= sendsBeforeFailure_ > 0 ? 1 : 0;
@@ -62,7 +47,7 @@ void SimulatedNetwork::send(tProtocolDataUnit& unit, tStatus& status) {
             }
         }
     } catch (const std::bad_alloc&) {
-        status.set(kStatusNoMemory, kComponent, kFile, __LINE__);
+        status.set(kStatusNoMemory, "simnet", "SimulatedNetwork", __LINE__);
     }
 }
 
@@ -74,25 +59,16 @@ void SimulatedNetwork::receive(tProtocolDataUnit& unit, tStatus& status) {
     std::vector<std::uint8_t> octets;
     if (!pop(octets)) {
         status.set(abortRequested_.exchange(false) ? kStatusAborted : kStatusOsObjectError,
-                   kComponent, kFile, __LINE__);
+                   "simnet", "SimulatedNetwork", __LINE__);
     } else if (octets.size() > kMaxDatagram) {
-        status.set(kStatusSocketError, kComponent, kFile, __LINE__);
+        status.set(kStatusSocketError, "simnet", "SimulatedNetwork", __LINE__);
     } else {
         unit.writeOctets(octets.data(), octets.size(), status);
     }
 }
 
-void SimulatedNetwork::abortReceive(tStatus&) {
-    abortRequested_.store(true);
-    wake();
-}
-
 void SimulatedNetwork::inject(std::vector<std::uint8_t> octets, std::chrono::milliseconds delay) {
     push(std::move(octets), tClock::now() + delay);
-}
-
-void SimulatedNetwork::failNextReceive() {
-    inject(std::vector<std::uint8_t>(kMaxDatagram + 1, 0));
 }
 
 void SimulatedNetwork::failSends(std::size_t successes, std::size_t count) {
@@ -104,11 +80,6 @@ void SimulatedNetwork::failSends(std::size_t successes, std::size_t count) {
 std::vector<std::vector<std::uint8_t>> SimulatedNetwork::sentDatagrams() const {
     std::lock_guard<std::mutex> guard(lock_);
     return sent_;
-}
-
-std::size_t SimulatedNetwork::sentCount() const {
-    std::lock_guard<std::mutex> guard(lock_);
-    return sent_.size();
 }
 
 std::size_t SimulatedNetwork::queuedCount() const {

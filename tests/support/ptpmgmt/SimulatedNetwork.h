@@ -26,14 +26,23 @@ class SimulatedNetwork final : public nQVPTP000::iPTPPortMessaging {
     static constexpr std::size_t kMaxDatagram = 1024;
 
     // The clock stays the caller's and must outlive the network's use.
-    void attach(SimulatedClock& clock);
+    void attach(SimulatedClock& clock) {
+        std::lock_guard<std::mutex> guard(lock_);
+        clocks_.push_back(&clock);
+    }
 
     void open(tStatus& status) override;
-    void close(tStatus& status) override;
+    void close(tStatus&) override {
+        open_.store(false);
+        wake();
+    }
     void sendEventMessage(nQVPTP000::tProtocolDataUnit& u, tStatus& s) override { send(u, s); }
     void sendGeneralMessage(nQVPTP000::tProtocolDataUnit& u, tStatus& s) override { send(u, s); }
     void receive(nQVPTP000::tProtocolDataUnit& unit, tStatus& status) override;
-    void abortReceive(tStatus& status) override;
+    void abortReceive(tStatus&) override {
+        abortRequested_.store(true);
+        wake();
+    }
     nQVPTP000::tPortAddress getPortAddress() override { return {}; }
 
     // Queues a datagram for receive as if it had arrived from the network.
@@ -41,14 +50,14 @@ class SimulatedNetwork final : public nQVPTP000::iPTPPortMessaging {
                 std::chrono::milliseconds delay = std::chrono::milliseconds(0));
     // Queues a datagram too long for the transport: the receive that meets it fails with
     // -52003, as the UDP transport's receive does for an oversized datagram.
-    void failNextReceive();
+    void failNextReceive() { inject(std::vector<std::uint8_t>(kMaxDatagram + 1, 0)); }
     // The next `count` sends fail with -52003 after `successes` more have gone out.
     void failSends(std::size_t successes = 0, std::size_t count = 1);
     void failNextSend() { failSends(0, 1); }
 
     // Every datagram sent successfully, in order.
     std::vector<std::vector<std::uint8_t>> sentDatagrams() const;
-    std::size_t sentCount() const;
+    std::size_t sentCount() const { return sentDatagrams().size(); }
     // Datagrams waiting for receive (delayed answers included).
     std::size_t queuedCount() const;
     bool isOpen() const { return open_.load(); }
@@ -62,14 +71,12 @@ class SimulatedNetwork final : public nQVPTP000::iPTPPortMessaging {
 
     mutable std::mutex lock_;
     std::condition_variable changed_;
-    std::vector<SimulatedClock*> clocks_;          // guarded by lock_
-    std::vector<std::vector<std::uint8_t>> sent_;  // guarded by lock_
-    std::size_t sendsBeforeFailure_ = 0;           // guarded by lock_
-    std::size_t failingSends_ = 0;                 // guarded by lock_
+    std::vector<SimulatedClock*> clocks_;                    // guarded by lock_
+    std::vector<std::vector<std::uint8_t>> sent_;            // guarded by lock_
+    std::size_t sendsBeforeFailure_ = 0, failingSends_ = 0;  // guarded by lock_
     // Answers by due time, in arrival order among equal times; guarded by lock_.
     std::multimap<tClock::time_point, std::vector<std::uint8_t>> arrivals_;
-    std::atomic<bool> open_{false};
-    std::atomic<bool> abortRequested_{false};
+    std::atomic<bool> open_{false}, abortRequested_{false};
 };
 
 }  // namespace qvtest
