@@ -16,8 +16,6 @@ namespace nQVPTP000 {
 
 namespace {
 
-constexpr std::uint8_t kCompatibilityBit = 0x10;
-constexpr std::uint8_t kAnnounceType = 0xB;
 // Room for any UDP datagram, so that an oversized one is read whole and its length known.
 constexpr std::size_t kLargestDatagram = 65536;
 
@@ -169,39 +167,10 @@ int tUDPNetworkInterface::openReceiveSocket(std::uint16_t port, tStatus& status)
     return fd;  // kept, like every socket of a failed open, until close
 }
 
-void tUDPNetworkInterface::close(tStatus&) {
-    padEventMessages_ = false;
-    std::unique_lock<std::mutex> guard(receiveLock_);
-    closing_ = true;
-    wake();
-    receiveIdle_.wait(guard, [this] { return activeReceives_ == 0; });
-    closeSockets();
-    closing_ = false;
-}
-
 void tUDPNetworkInterface::closeSockets() {
     closeIfValid(sendSocket_);
     closeIfValid(eventSocket_);
     closeIfValid(generalSocket_);
-}
-
-void tUDPNetworkInterface::sendEventMessage(tProtocolDataUnit& unit, tStatus& status) {
-    if (status.failed()) {
-        return;
-    }
-    if (padEventMessages_) {
-        while (status.succeeded() && unit.getLength() < kCompatibilityLength) {
-            unit.writeOctet(0, status);
-        }
-    }
-    sendTo(kEventPort, unit, status);
-}
-
-void tUDPNetworkInterface::sendGeneralMessage(tProtocolDataUnit& unit, tStatus& status) {
-    if (status.failed()) {
-        return;
-    }
-    sendTo(kGeneralPort, unit, status);
 }
 
 void tUDPNetworkInterface::sendTo(std::uint16_t port, const tProtocolDataUnit& unit,
@@ -218,19 +187,6 @@ void tUDPNetworkInterface::sendTo(std::uint16_t port, const tProtocolDataUnit& u
                sizeof(target)) == SOCKET_ERROR) {
         QV_STATUS_SET(status, kStatusSocketError, kComponentCodec);
     }
-}
-
-void tUDPNetworkInterface::abortReceive(tStatus&) {
-    stopRequested_ = true;
-    wake();
-}
-
-bool tUDPNetworkInterface::reportAbort(tStatus& status) {
-    if (!stopRequested_.exchange(false)) {
-        return false;
-    }
-    QV_STATUS_SET(status, kStatusAborted, kComponentCodec);
-    return true;
 }
 
 void tUDPNetworkInterface::receive(tProtocolDataUnit& unit, tStatus& status) {
@@ -323,13 +279,6 @@ bool tUDPNetworkInterface::awaitDatagram(int& readySocket, tStatus& status) {
     }
 }
 
-void tUDPNetworkInterface::noteCompatibility(std::uint8_t firstOctet, bool eventPort) {
-    const bool flagged = (firstOctet & kCompatibilityBit) != 0;
-    if (flagged && (eventPort || (firstOctet & 0x0F) == kAnnounceType)) {
-        padEventMessages_ = true;
-    }
-}
-
 void tUDPNetworkInterface::wake() {
     const int fd = wakeEvent_.load();
     if (fd < 0) {
@@ -348,14 +297,6 @@ void tUDPNetworkInterface::drainWake() {
     char octet = 0;
     while (recv(handleOf(wakeEvent_.load()), &octet, 1, 0) > 0) {
     }
-}
-
-tPortAddress tUDPNetworkInterface::getPortAddress() {
-    constexpr std::uint16_t kUdpIpv4 = 1;
-    std::uint8_t address[4];
-    std::memcpy(address, &groupAddress_, sizeof(address));  // network order
-    tStatus unused;                                         // four octets always fit
-    return tPortAddress(kUdpIpv4, sizeof(address), address, unused);
 }
 
 }  // namespace nQVPTP000

@@ -1,0 +1,75 @@
+#include "ptp/transport/tUDPNetworkInterface.h"
+
+#include <cstring>
+
+// The parts of the UDP interface that are the same on every system: padding of event
+// messages for compatible peers, the abort flag, and closing once no receive runs. The
+// sockets themselves are in tUDPNetworkInterface.cpp (POSIX) and
+// tUDPNetworkInterfaceWin32.cpp (Winsock).
+namespace nQVPTP000 {
+
+namespace {
+
+constexpr std::uint8_t kCompatibilityBit = 0x10;
+constexpr std::uint8_t kAnnounceType = 0xB;
+
+}  // namespace
+
+void tUDPNetworkInterface::close(tStatus&) {
+    padEventMessages_ = false;
+    std::unique_lock<std::mutex> guard(receiveLock_);
+    closing_ = true;
+    wake();
+    receiveIdle_.wait(guard, [this] { return activeReceives_ == 0; });
+    closeSockets();
+    closing_ = false;
+}
+
+void tUDPNetworkInterface::sendEventMessage(tProtocolDataUnit& unit, tStatus& status) {
+    if (status.failed()) {
+        return;
+    }
+    if (padEventMessages_) {
+        while (status.succeeded() && unit.getLength() < kCompatibilityLength) {
+            unit.writeOctet(0, status);
+        }
+    }
+    sendTo(kEventPort, unit, status);
+}
+
+void tUDPNetworkInterface::sendGeneralMessage(tProtocolDataUnit& unit, tStatus& status) {
+    if (status.failed()) {
+        return;
+    }
+    sendTo(kGeneralPort, unit, status);
+}
+
+void tUDPNetworkInterface::abortReceive(tStatus&) {
+    stopRequested_ = true;
+    wake();
+}
+
+bool tUDPNetworkInterface::reportAbort(tStatus& status) {
+    if (!stopRequested_.exchange(false)) {
+        return false;
+    }
+    QV_STATUS_SET(status, kStatusAborted, kComponentCodec);
+    return true;
+}
+
+void tUDPNetworkInterface::noteCompatibility(std::uint8_t firstOctet, bool eventPort) {
+    const bool flagged = (firstOctet & kCompatibilityBit) != 0;
+    if (flagged && (eventPort || (firstOctet & 0x0F) == kAnnounceType)) {
+        padEventMessages_ = true;
+    }
+}
+
+tPortAddress tUDPNetworkInterface::getPortAddress() {
+    constexpr std::uint16_t kUdpIpv4 = 1;
+    std::uint8_t address[4];
+    std::memcpy(address, &groupAddress_, sizeof(address));  // network order
+    tStatus unused;                                         // four octets always fit
+    return tPortAddress(kUdpIpv4, sizeof(address), address, unused);
+}
+
+}  // namespace nQVPTP000
