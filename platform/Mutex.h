@@ -55,6 +55,10 @@ class Mutex {
     };
 
   private:
+    // The in-process lock of a path, shared by every Mutex of it that is alive: the
+    // system-wide lock excludes processes, this one the threads of this process.
+    static std::shared_ptr<std::mutex> threadLockOf(const std::string& path);
+
     std::string path_;
     std::shared_ptr<std::mutex> threads_;  // shared by every Mutex of this path
     int fd_ = -1;

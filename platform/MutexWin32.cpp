@@ -67,21 +67,6 @@ class tOpenDescriptor {
     SECURITY_ATTRIBUTES attributes_{};
 };
 
-// The in-process lock of a name, shared by every Mutex of it that is alive.
-std::shared_ptr<std::mutex> threadLockOf(const std::string& path) {
-    static std::mutex guard;
-    static std::map<std::string, std::weak_ptr<std::mutex>> locks;
-    const std::lock_guard<std::mutex> held(guard);
-    std::erase_if(locks, [](const auto& entry) { return entry.second.expired(); });
-    std::weak_ptr<std::mutex>& slot = locks[path];
-    std::shared_ptr<std::mutex> lock = slot.lock();
-    if (!lock) {
-        lock = std::make_shared<std::mutex>();
-        slot = lock;
-    }
-    return lock;
-}
-
 HANDLE handleOf(int stored) {
     return LongToHandle(stored);
 }
