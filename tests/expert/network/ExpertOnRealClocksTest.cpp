@@ -3,25 +3,36 @@
 #include <dirent.h>
 #include <gtest/gtest.h>
 
+#include <chrono>
 #include <functional>
 #include <map>
 #include <string>
+#include <thread>
 #include <tuple>
 #include <vector>
 
+#include "qv1588/corbel.h"
 #include "tests/expert/network/LoadedExpert.h"
 #include "tests/support/NetworkNamespaceEntry.h"
 #include "tests/support/NetworkTestGuard.h"
+#include "tests/support/TestNetwork.h"
 
 namespace {
 
 using namespace qvtest;
+using namespace std::chrono_literals;
 using tValues = std::map<std::string, std::string>;
 
-// One form for pmc's text and ours: the last word, lower case, no separators between octets
-// or fields.
+// One form for pmc's text and ours: the last word, 0x numbers as decimal, no ".0" ending,
+// lower case, no separators between octets or fields.
 std::string canonical(const std::string& text) {
-    const std::string word = text.substr(text.find_last_of(' ') + 1);
+    std::string word = text.substr(text.find_last_of(' ') + 1);
+    if (word.rfind("0x", 0) == 0) {
+        return std::to_string(std::stoul(word, nullptr, 16));
+    }
+    if (word.ends_with(".0")) {
+        word.resize(word.size() - 2);
+    }
     std::string result;
     for (std::size_t i = 0; i < word.size(); ++i) {
         if (std::string(".:-").find(word[i]) == std::string::npos || (i == 0 && word[i] == '-')) {
@@ -31,16 +42,38 @@ std::string canonical(const std::string& text) {
     return result;
 }
 
-// Our tag and the management id and name under which pmc prints the same member: a member of
-// each conversion (the unit tests hold the rest against a simulated clock); none that
-// changes while a lone clock settles.
+// Our tag and the management id and name under which pmc prints the same member: members of
+// every group that both clocks serve, in every conversion; none that changes while a lone
+// clock settles.
 const std::tuple<kxSysAttributeTagID, const char*, const char*> kComparisons[] = {
     {kxQvDomainNumber, "DEFAULT_DATA_SET", "domainNumber"},
+    {kxQvPriority1, "DEFAULT_DATA_SET", "priority1"},
+    {kxQvClockAccuracy, "DEFAULT_DATA_SET", "clockAccuracy"},
+    {kxQvAnnounceReceiptTimeout, "PORT_DATA_SET", "announceReceiptTimeout"},
     {kxQvLogSyncInterval, "PORT_DATA_SET", "logSyncInterval"},
+    {kxQvTimeSource, "TIME_PROPERTIES_DATA_SET", "timeSource"},
     {kxQvParentPortIdentity, "PARENT_DATA_SET", "parentPortIdentity"},
     {kxSysHardwareAddress, "CLOCK_DESCRIPTION", "physicalAddress"},
     {kxSysNetworkAddress, "CLOCK_DESCRIPTION", "protocolAddress"},
+    {kxQvUserDescription, "CLOCK_DESCRIPTION", "userDescription"},
 };
+
+// The management ids of every SET and COMMAND that went to br0 while `action` ran.
+std::string requestsSentDuring(const TestNetwork& network, const std::function<void()>& action) {
+    const std::string file = "/tmp/qv-expert-" + network.prefix() + ".pcap";
+    std::thread capture(
+        [&] { network.runInClient("timeout 3 tcpdump -U -i br0 -w " + file + " udp port 320"); });
+    for (int i = 0; i < 100 && runCommand("test -s " + file).exitStatus != 0; ++i) {
+        std::this_thread::sleep_for(20ms);
+    }
+    action();
+    capture.join();
+    return runCommand("tshark -r " + file +
+                      " -Y 'ptp.v2.mm.action == 1 || ptp.v2.mm.action == 3' -T fields -e "
+                      "ptp.v2.mm.managementId 2>/dev/null; rm -f " +
+                      file)
+        .output;
+}
 
 std::size_t entriesOf(const char* folder) {
     std::size_t count = 0;
@@ -53,8 +86,8 @@ std::size_t entriesOf(const char* folder) {
 }
 
 TEST(ExpertOnRealClocks, FindsReadsWritesAndLeavesNothingBehind) {
-    QV_REQUIRE_TEST_NETWORK("ptp4l", "ptpd", "pmc");
-    TestNetwork network({"ptpd:domain=0", "ptp4l:domain=1", "ptp4l:domain=2"});
+    QV_REQUIRE_TEST_NETWORK("ptp4l", "ptpd", "pmc", "tcpdump", "tshark");
+    TestNetwork network({"ptpd:domain=0", "ptp4l:domain=1:prio1=99:desc=beta", "ptp4l:domain=2"});
     ASSERT_TRUE(network.isUp()) << network.failure();
     NetworkNamespaceEntry entry(network.clientNamespace());
     ASSERT_TRUE(entry.entered()) << entry.failure();
@@ -78,9 +111,18 @@ TEST(ExpertOnRealClocks, FindsReadsWritesAndLeavesNothingBehind) {
     IkxSysExpert2* expert = nullptr;
     ASSERT_EQ(create(&expert), S_OK);
     ASSERT_EQ(expert->Initialize(), S_OK);
-    IkxSysEnumStringList* names = nullptr;  // the clocks are found (corbel's test lists them)
+    std::vector<std::u16string> expected;
+    std::vector<std::u16string> found;
+    for (const TestClock& clock : network.clocks()) {
+        expected.push_back(itemNameOf(clock));
+    }
+    IkxSysEnumStringList* names = nullptr;
     ASSERT_EQ(expert->GetItemNames(&names), S_OK);
+    for (BSTR name = nullptr; names->Next(1, &name, nullptr) == S_OK; SysFreeString(name)) {
+        found.emplace_back(name);
+    }
     names->Release();
+    EXPECT_EQ(found, expected);
 
     // ptp4l refuses TIME and UTC_PROPERTIES: the read fails, the rest is in the bag.
     const std::vector<kxSysAttributeTagID> readable = readableTags();
@@ -98,7 +140,7 @@ TEST(ExpertOnRealClocks, FindsReadsWritesAndLeavesNothingBehind) {
         }
         bag->Release();
     }
-    // Applies what `change` sets in a bag of the expert's own.
+    // Validates and applies what `change` sets in a bag of the expert's own.
     auto write = [&](const TestClock& clock,
                      const std::function<void(IkxSysPropertyBag2&)>& change) {
         IkxSysPropertyBag* bag = nullptr;
@@ -107,21 +149,45 @@ TEST(ExpertOnRealClocks, FindsReadsWritesAndLeavesNothingBehind) {
         bag->QueryInterface(IID_IkxSysPropertyBag2, reinterpret_cast<void**>(&changes));
         changes->ClearChangedTags();
         change(*changes);
+        IkxSysEnumPropertyTag* accepted = nullptr;
+        BSTR message = nullptr;
+        EXPECT_EQ(expert->ValidateChanges(nullptr, bag, &accepted, &message), S_OK);
+        SysFreeString(message);
+        accepted->Release();
         const HRESULT result = expert->ApplyChanges(itemNameOf(clock).c_str(), bag, nullptr);
         changes->Release();
         bag->Release();
         return result;
     };
     const TestClock& ptpd = network.clocks()[0];
-    EXPECT_EQ(
-        write(ptpd,
-              [](IkxSysPropertyBag2& b) { b.SetString(kxQvUserDescription, u"renamed;by;qv"); }),
-        S_OK);
+    EXPECT_EQ(write(ptpd,
+                    [](IkxSysPropertyBag2& b) {
+                        b.SetULong(kxQvPriority1, 77);
+                        b.SetULong(kxQvPriority2, 78);
+                        b.SetString(kxQvUserDescription, u"renamed;by;qv");
+                        b.SetLong(kxQvLogAnnounceInterval, 2);
+                    }),
+              S_OK);
+    EXPECT_EQ(pmcValues(network, ptpd, "PRIORITY1")["priority1"], "77");
+    EXPECT_EQ(pmcValues(network, ptpd, "PRIORITY2")["priority2"], "78");
     EXPECT_EQ(pmcValues(network, ptpd, "USER_DESCRIPTION")["userDescription"], "renamed;by;qv");
+    EXPECT_EQ(pmcValues(network, ptpd, "LOG_ANNOUNCE_INTERVAL")["logAnnounceInterval"], "2");
     EXPECT_EQ(write(ptpd, [](IkxSysPropertyBag2& b) { b.SetBool(kxQvPortEnabled, 0); }), S_OK);
     EXPECT_EQ(pmcValues(network, ptpd, "PORT_DATA_SET")["portState"], "DISABLED");
     EXPECT_EQ(write(ptpd, [](IkxSysPropertyBag2& b) { b.SetBool(kxQvPortEnabled, 1); }), S_OK);
 
+    const TestClock& ptp4l = network.clocks()[1];
+    HRESULT refused = S_OK;
+    EXPECT_EQ(requestsSentDuring(network,
+                                 [&] {
+                                     refused = write(ptp4l, [](IkxSysPropertyBag2& b) {
+                                         b.SetULong(kxQvPriority1, 33);
+                                         b.SetULong(kxQvPriority2, 34);
+                                     });
+                                 }),
+              "8197\n");  // PRIORITY1 (0x2005) only
+    EXPECT_EQ(refused, E_FAIL);
+    EXPECT_EQ(pmcValues(network, ptp4l, "PRIORITY1")["priority1"], "99");
     EXPECT_EQ(expert->Shutdown(), S_OK);
     expert->Release();
 }
