@@ -2,6 +2,7 @@
 #define QV_PLATFORM_CALENDARTIME_H
 
 #include <cstdint>
+#include <ctime>
 
 namespace qv::dsc {
 
@@ -17,6 +18,10 @@ struct CalendarTime {
     std::int32_t dayOfYear = 0;        // 0-365
     std::int32_t daylightSaving = -1;  // > 0 in force, 0 not, < 0 unknown
 };
+
+// The C library's form of the same fields, for both local-time backends.
+std::tm toTm(const CalendarTime& in);
+CalendarTime fromTm(const std::tm& in);
 
 }  // namespace qv::dsc
 

@@ -54,7 +54,17 @@ class tUDPNetworkInterface final : public iPTPPortMessaging {
     bool isCompatibilityMode() const { return padEventMessages_.load(); }
 
   private:
-    class tReceiveScope;
+    // Counts a running receive so that close waits for it to leave.
+    class tReceiveScope {
+      public:
+        explicit tReceiveScope(tUDPNetworkInterface& owner);
+        ~tReceiveScope();
+        tReceiveScope(const tReceiveScope&) = delete;
+        tReceiveScope& operator=(const tReceiveScope&) = delete;
+
+      private:
+        tUDPNetworkInterface& owner_;
+    };
 
     int openReceiveSocket(std::uint16_t port, tStatus& status);
     void sendTo(std::uint16_t port, const tProtocolDataUnit& unit, tStatus& status);

@@ -15,6 +15,17 @@ constexpr std::uint8_t kAnnounceType = 0xB;
 
 }  // namespace
 
+tUDPNetworkInterface::tReceiveScope::tReceiveScope(tUDPNetworkInterface& owner) : owner_(owner) {
+    const std::lock_guard<std::mutex> guard(owner_.receiveLock_);
+    ++owner_.activeReceives_;
+}
+
+tUDPNetworkInterface::tReceiveScope::~tReceiveScope() {
+    const std::lock_guard<std::mutex> guard(owner_.receiveLock_);
+    --owner_.activeReceives_;
+    owner_.receiveIdle_.notify_all();
+}
+
 void tUDPNetworkInterface::close(tStatus&) {
     padEventMessages_ = false;
     std::unique_lock<std::mutex> guard(receiveLock_);

@@ -80,25 +80,6 @@ int newWakeSocket() {
 
 }  // namespace
 
-// Counts a running receive so that close waits for it to leave.
-class tUDPNetworkInterface::tReceiveScope {
-  public:
-    explicit tReceiveScope(tUDPNetworkInterface& owner) : owner_(owner) {
-        const std::lock_guard<std::mutex> guard(owner_.receiveLock_);
-        ++owner_.activeReceives_;
-    }
-    ~tReceiveScope() {
-        const std::lock_guard<std::mutex> guard(owner_.receiveLock_);
-        --owner_.activeReceives_;
-        owner_.receiveIdle_.notify_all();
-    }
-    tReceiveScope(const tReceiveScope&) = delete;
-    tReceiveScope& operator=(const tReceiveScope&) = delete;
-
-  private:
-    tUDPNetworkInterface& owner_;
-};
-
 tUDPNetworkInterface::tUDPNetworkInterface() {
     groupAddress_ = inet_addr(kMulticastGroup);
 }
