@@ -1,7 +1,7 @@
 #ifndef QV_CORBEL_READGROUPS_H
 #define QV_CORBEL_READGROUPS_H
 
-#include <qv1588/corbel.h>
+#include <qv1588/qv1588.h>
 
 #include <vector>
 

@@ -6,7 +6,7 @@
 #include "expert/clocks/CPtpBagFiller.h"
 #include "platform/tStatus.h"
 #include "ptpmgmt/iPTPClockProxy.h"
-#include "qv1588/corbel.h"
+#include "qv1588/qv1588.h"
 
 // Reads a clock port's attributes into a bag: the item's base properties, and the tags a
 // host asks for, one management GET per source in the order of kxQvSource.

@@ -7,7 +7,7 @@
 
 #include "platform/tStatus.h"
 #include "ptpmgmt/iPTPClockProxy.h"
-#include "qv1588/corbel.h"
+#include "qv1588/qv1588.h"
 
 // Checks and writes the settable attributes (kxQvAttribute::settable) of a clock port.
 class CPtpAttributeWriter {

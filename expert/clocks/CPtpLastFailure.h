@@ -4,7 +4,7 @@
 #include <string>
 
 #include "platform/tStatus.h"
-#include "qv1588/corbel.h"
+#include "qv1588/qv1588.h"
 
 // The calling thread's record of why its last expert operation failed (IkxQvLastFailure).
 // A host reads it on the thread that made the failing call, as with COM's error objects;

@@ -15,7 +15,7 @@
 #include "ptp/transport/iPTPPortMessaging.h"
 #include "ptp/transport/tUDPNetworkInterface.h"
 #include "ptpmgmt/tPTPMgmtNode.h"
-#include "qv1588/corbel.h"
+#include "qv1588/qv1588.h"
 
 // The expert: every PTP clock port that answers management messages on the network is an
 // item whose attributes the host reads and changes. Created as CQVComObject<CPtpSysExpert>.

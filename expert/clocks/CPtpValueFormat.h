@@ -10,7 +10,7 @@
 #include "ptp/tTimeInterval.h"
 #include "ptp/tTimestamp.h"
 #include "ptpmgmt/tClockKey.h"
-#include "qv1588/corbel.h"
+#include "qv1588/qv1588.h"
 
 // How PTP values appear to the host, and item names back to clock keys.
 class CPtpValueFormat {

@@ -4,7 +4,7 @@
 #include <string>
 #include <vector>
 
-#include "qv1588/corbel.h"
+#include "qv1588/qv1588.h"
 
 namespace qvtest {
 

@@ -11,7 +11,7 @@
 #include <tuple>
 #include <vector>
 
-#include "qv1588/corbel.h"
+#include "qv1588/qv1588.h"
 #include "tests/expert/network/LoadedExpert.h"
 #include "tests/support/NetworkNamespaceEntry.h"
 #include "tests/support/NetworkTestGuard.h"

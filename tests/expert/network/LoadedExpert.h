@@ -6,7 +6,7 @@
 #include <string>
 #include <vector>
 
-#include "qv1588/corbel.h"
+#include "qv1588/qv1588.h"
 #include "tests/expert/clocks/BagText.h"
 #include "tests/support/TestNetwork.h"
 
