@@ -53,17 +53,10 @@ TEST_F(ExpertFixture, MisuseIsRefusedAndAFailureSaysWhy) {
     EXPECT_EQ(expert->GetItemProperties(kPort1, 2, nullptr, nullptr, bag.Receive()), E_POINTER);
     clock.setFault(SimulatedClock::Fault::errorStatus);
     EXPECT_EQ(read({kxQvPriority1}, bag), E_FAIL);
-    CQVComPtr<IkxQvLastFailure> failure;
-    ASSERT_EQ(
-        expert->QueryInterface(IID_IkxQvLastFailure, reinterpret_cast<void**>(failure.Receive())),
-        S_OK);
-    BSTR description = nullptr;
-    EXPECT_EQ(failure->GetLastFailure(&description, nullptr), S_OK);
-    const std::u16string text(description);
-    EXPECT_EQ(std::string(text.begin(), text.end()),
+    EXPECT_EQ(lastFailure(),
               "reading the clock's attributes: refused by the clock: GENERAL_ERROR (simulated "
-              "failure) (status -52012)");
-    SysFreeString(description);
+              "failure)");
+    EXPECT_EQ(lastCause(), (tCause{kxQvFailureKind::refusedByClock, 0xFFFE, 0}));
 }
 
 std::size_t tagCount(IkxSysPropertyBag& bag) {
