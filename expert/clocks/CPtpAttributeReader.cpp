@@ -227,7 +227,7 @@ HRESULT CPtpAttributeReader::readRequested(iPTPClockProxy& proxy, ULONG count,
             served += requested[group];
             continue;
         }
-        if (filler.result() == E_OUTOFMEMORY) {
+        if (filler.result() == E_OUTOFMEMORY || status.code == kStatusNoMemory) {
             outcome = E_OUTOFMEMORY;
         } else if (outcome == S_OK) {
             failure = status;
