@@ -9,6 +9,9 @@
 #include "corbel/Commands.h"
 #include "corbel/ExpertSession.h"
 #include "corbel/TagCatalog.h"
+#ifdef QV_CORBEL_SERVE
+#include "corbel/serve/ServeCommand.h"
+#endif
 
 namespace {
 
@@ -89,6 +92,35 @@ int main(int argc, char** argv) {
                     "times as 2026-12-06T20:15:00Z")
         ->required();
 
+#ifdef QV_CORBEL_SERVE
+    corbel::ServeOptions serveOptions;
+    auto* serve = app.add_subcommand(
+        "serve",
+        "runs until stopped: reads every clock each interval and serves the clocks as an HTTP "
+        "API (/api/v1/...), Prometheus metrics (/metrics) and the explorer page (/)");
+    serve->add_option("--listen", serveOptions.listen, "address and port to listen on")
+        ->type_name("ADDR:PORT")
+        ->capture_default_str();
+    serve->add_option("--interval", serveOptions.interval, "seconds between two reads of a clock")
+        ->type_name("S")
+        ->check(CLI::Range(1, 3600))
+        ->capture_default_str();
+    serve->add_option("--rediscover", serveOptions.rediscover, "seconds between two discoveries")
+        ->type_name("S")
+        ->check(CLI::Range(1, 86400))
+        ->capture_default_str();
+    serve->add_flag("--read-only", serveOptions.readOnly, "refuse every write");
+    serve
+        ->add_option("--token-file", serveOptions.tokenFile,
+                     "the token that writes need, on the file's first line (else "
+                     "CORBEL_SERVE_TOKEN, else one is made and printed at start)")
+        ->type_name("FILE");
+    serve
+        ->add_option("--allow-host", serveOptions.allowHosts,
+                     "a further name that requests may give as Host (repeatable)")
+        ->type_name("NAME");
+#endif
+
     try {
         app.parse(argc, argv);
     } catch (const CLI::ParseError& error) {
@@ -110,6 +142,13 @@ int main(int argc, char** argv) {
         } else if (*set) {
             code = corbel::runSet(options, item, words);
         }
+#ifdef QV_CORBEL_SERVE
+        else if (*serve) {
+            serveOptions.expertPath = options.expertPath;
+            serveOptions.waitMilliseconds = options.waitMilliseconds;
+            code = corbel::runServe(serveOptions);
+        }
+#endif
         return corbel::toInt(code);
     } catch (const std::exception& error) {
         std::fprintf(stderr, "corbel: %s\n", error.what());
