@@ -55,6 +55,23 @@ bool BoundedSocketStream::fill() {
     return true;
 }
 
+void BoundedSocketStream::drain() {
+    const auto until = Clock::now() + std::chrono::milliseconds(100);
+    std::size_t dropped = 0;
+    while (dropped < 64 * 1024) {
+        const auto left =
+            std::chrono::duration_cast<std::chrono::milliseconds>(until - Clock::now());
+        if (left.count() <= 0 || !waitFor(POLLIN, left)) {
+            return;
+        }
+        const ssize_t received = ::recv(socket_, buffer_.data(), buffer_.size(), 0);
+        if (received <= 0) {
+            return;
+        }
+        dropped += static_cast<std::size_t>(received);
+    }
+}
+
 bool BoundedSocketStream::is_writable() const {
     return !spent_ &&
            waitFor(POLLOUT, std::chrono::duration_cast<std::chrono::milliseconds>(kWait));

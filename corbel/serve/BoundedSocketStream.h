@@ -31,6 +31,8 @@ class BoundedSocketStream final : public httplib::Stream {
     bool awaitRequest(std::chrono::milliseconds idle, Running running);
     // Starts the bounds of the next request.
     void beginRequest();
+    // Reads and drops what the peer still sends, up to 64 KiB within 100 ms.
+    void drain();
     // Whether a bound was hit or the peer went away: the connection must not be used again.
     bool spent() const { return spent_; }
     // The status of the last response written (from its status line).

@@ -105,7 +105,10 @@ bool HttpServer::process_and_close_socket(socket_t socket) {
             break;
         }
     }
-    ::shutdown(socket, SHUT_RDWR);
+    // What the client still sends is read and dropped for a moment: closing with unread
+    // data would reset the connection and could lose the answer on its way.
+    ::shutdown(socket, SHUT_WR);
+    stream.drain();
     ::close(socket);
     return served;
 }

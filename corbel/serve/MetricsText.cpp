@@ -37,10 +37,10 @@ void family(std::string& text, const char* name, const char* type, const char* h
 using Reading = std::function<std::optional<double>(const ClockStatus&)>;
 
 template <typename T>
-Reading tagValue(kxSysAttributeTagID tag, double scale = 1.0) {
-    return [tag, scale](const ClockStatus& clock) -> std::optional<double> {
+Reading tagValue(kxSysAttributeTagID tag, double perUnit = 1.0) {
+    return [tag, perUnit](const ClockStatus& clock) -> std::optional<double> {
         const T* value = clock.value<T>(tag);
-        return value != nullptr ? std::optional<double>(static_cast<double>(*value) * scale)
+        return value != nullptr ? std::optional<double>(static_cast<double>(*value) / perUnit)
                                 : std::nullopt;
     };
 }
@@ -54,9 +54,9 @@ struct ClockGauge {
 void clockGauges(std::string& text, const Snapshot& snapshot) {
     const ClockGauge gauges[] = {
         {"ptp_offset_from_master_seconds", "Offset from master (currentDS.offsetFromMaster).",
-         tagValue<double>(kxQvOffsetFromMaster, 1e-9)},
+         tagValue<double>(kxQvOffsetFromMaster, 1e9)},
         {"ptp_mean_path_delay_seconds", "Mean path delay (currentDS.meanPathDelay).",
-         tagValue<double>(kxQvMeanPathDelay, 1e-9)},
+         tagValue<double>(kxQvMeanPathDelay, 1e9)},
         {"ptp_port_state", "Port state, the IEEE 1588 number (6 MASTER, 9 SLAVE, ...).",
          tagValue<std::int32_t>(kxQvPortState)},
         {"ptp_steps_removed", "Steps removed from the grandmaster.",
@@ -98,6 +98,12 @@ void serviceMetrics(std::string& text, const Snapshot& snapshot, const ServiceCo
     if (snapshot.discovery) {
         text += "corbel_discovery_duration_seconds " + number(snapshot.discovery->durationSeconds) +
                 "\n";
+    }
+    family(text, "corbel_poll_duration_seconds", "gauge",
+           "How long the last round of reads of every clock took (writes served within it "
+           "included).");
+    if (snapshot.roundSeconds) {
+        text += "corbel_poll_duration_seconds " + number(*snapshot.roundSeconds) + "\n";
     }
     std::size_t present = 0;
     for (const ClockStatus& clock : snapshot.clocks) {

@@ -131,6 +131,7 @@ void Poller::discover() {
 }
 
 void Poller::readAll(bool withVanished) {
+    const auto began = Steady::now();
     for (auto& [item, clock] : clocks_) {
         if (stopping()) {
             return;
@@ -140,6 +141,7 @@ void Poller::readAll(bool withVanished) {
         }
         serveWrites();
     }
+    roundSeconds_ = std::chrono::duration<double>(Steady::now() - began).count();
 }
 
 void Poller::read(Tracked& clock) {
@@ -258,6 +260,7 @@ void Poller::countFailures(const std::vector<ReadFailure>& failures) {
 void Poller::publish() {
     auto snapshot = std::make_shared<Snapshot>();
     snapshot->discovery = discovery_;
+    snapshot->roundSeconds = roundSeconds_;
     snapshot->clocks.reserve(clocks_.size());
     for (const auto& [item, clock] : clocks_) {
         snapshot->clocks.push_back(clock.status);

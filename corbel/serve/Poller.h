@@ -76,6 +76,7 @@ class Poller final : public SettingsWriter {
     // The poller thread's own: the clocks by item name and the last discovery.
     std::map<std::string, Tracked> clocks_;
     std::optional<DiscoveryStatus> discovery_;
+    std::optional<double> roundSeconds_;
 
     std::mutex lock_;
     std::condition_variable wake_;

@@ -45,6 +45,7 @@ struct DiscoveryStatus {
 // What the HTTP workers read: published whole by the poller and never changed after.
 struct Snapshot {
     std::optional<DiscoveryStatus> discovery;  // the last one; none before the first ends
+    std::optional<double> roundSeconds;        // how long the last round of reads took
     std::vector<ClockStatus> clocks;           // in item-name order
 
     // By item name in any case; null when there is none.

@@ -22,9 +22,11 @@ std::string isoTime(WallTime time) {
     const std::int64_t seconds = milliseconds / 1000 - (milliseconds % 1000 < 0 ? 1 : 0);
     // Half a nanosecond more, so that the formatter's truncation to nanoseconds gives the
     // milliseconds exactly.
-    const double rest = static_cast<double>(milliseconds - seconds * 1000) * 1e6 + 0.5;
-    const kxSysAttrTimestampUTC stamp{static_cast<std::uint64_t>(std::ldexp(rest / 1e9, 64)),
-                                      seconds + kUnixEpochSince1904};
+    const std::int64_t rest = milliseconds - seconds * 1000;
+    const double nanoseconds = static_cast<double>(rest) * 1e6 + 0.5;
+    const kxSysAttrTimestampUTC stamp{
+        rest == 0 ? 0 : static_cast<std::uint64_t>(std::ldexp(nanoseconds / 1e9, 64)),
+        seconds + kUnixEpochSince1904};
     return formatUtc(stamp);
 }
 
