@@ -21,6 +21,13 @@ install(TARGETS qv1588 qv_host_api EXPORT qv1588Targets
 install(DIRECTORY ${PROJECT_SOURCE_DIR}/expert/include/qv1588
         DESTINATION ${CMAKE_INSTALL_INCLUDEDIR})
 install(TARGETS corbel RUNTIME DESTINATION ${CMAKE_INSTALL_BINDIR})
+# corbel serve as a systemd service; systemd finds units under <prefix>/lib/systemd/system
+# for the prefixes /usr and /usr/local.
+if(TARGET corbel_serve)
+  configure_file(${PROJECT_SOURCE_DIR}/corbel/serve/corbel-serve.service.in
+                 ${CMAKE_CURRENT_BINARY_DIR}/corbel-serve.service @ONLY)
+  install(FILES ${CMAKE_CURRENT_BINARY_DIR}/corbel-serve.service DESTINATION lib/systemd/system)
+endif()
 install(EXPORT qv1588Targets NAMESPACE qv1588:: DESTINATION ${QV_CMAKE_PACKAGE_DIR})
 
 file(WRITE ${CMAKE_CURRENT_BINARY_DIR}/qv1588Config.cmake
