@@ -17,6 +17,7 @@ class ChildProcess {
     ChildProcess(const ChildProcess&) = delete;
     ChildProcess& operator=(const ChildProcess&) = delete;
 
+    pid_t pid() const { return pid_; }
     // Sends SIGTERM and waits: the exit code, -1 when it did not end normally.
     int stop();
 
