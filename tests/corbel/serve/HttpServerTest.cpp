@@ -35,10 +35,10 @@ std::string exchange(int port, const std::string& request) {
     return answer;
 }
 
-std::string headers(int count) {
+std::string headers(int count, std::size_t length = 1) {
     std::string lines;
     for (int i = 0; i < count; ++i) {
-        lines += "X-" + std::to_string(i) + ": a\r\n";
+        lines += "X-" + std::to_string(i) + ": " + std::string(length, 'a') + "\r\n";
     }
     return lines;
 }
@@ -60,6 +60,8 @@ TEST(ServeHttp, AnswersMalformedAndOversizedRequestsWithJsonErrors) {
         {"GET /" + std::string(9000, 'a') + " HTTP/1.1\r\n" + host + "\r\n", 400},
         {"GET /api/v1/status HTTP/1.1\r\n" + host + "X: " + std::string(20000, 'a') + "\r\n\r\n",
          400},
+        // Lines the library takes one by one, but 9 KiB together.
+        {"GET /api/v1/status HTTP/1.1\r\n" + host + headers(45, 200) + close, 400},
         {"GET /api/v1/status HTTP/1.1\r\n" + host + headers(64) + "\r\n", 400},
         {"GET /api/v1/status HTTP/1.1\r\n" + host + headers(62) + close, 200},  // 64 in all
         {"POST /api/v1/clocks/" + qvtest::kPtp4lItem + "/settings HTTP/1.1\r\n" + host +
@@ -81,7 +83,7 @@ TEST(ServeHttp, AnswersMalformedAndOversizedRequestsWithJsonErrors) {
     serving.join();
     const auto counted = service.state.counters().responses();
     EXPECT_EQ(counted,
-              (std::vector<std::pair<int, std::uint64_t>>{{200, 2}, {400, 5}, {403, 1}, {413, 1}}));
+              (std::vector<std::pair<int, std::uint64_t>>{{200, 2}, {400, 6}, {403, 1}, {413, 1}}));
 }
 
 }  // namespace

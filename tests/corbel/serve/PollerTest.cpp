@@ -70,3 +70,15 @@ TEST(ServePoller, NotesChangesAsEventsKeepsHistoryAndMarksAClockThatStopsAnsweri
 }
 
 }  // namespace
+
+TEST(ServeHistory, KeepsTheNewestSamplesOldestFirst) {
+    History history(3);
+    for (std::int64_t time = 1; time <= 5; ++time) {
+        history.append({time * 1000, -static_cast<double>(time), std::nullopt, 9});
+    }
+    std::vector<double> offsets;
+    for (const HistorySample& sample : history.samples()) {
+        offsets.push_back(*sample.offsetFromMaster);
+    }
+    EXPECT_EQ(offsets, (std::vector<double>{-3, -4, -5}));
+}
