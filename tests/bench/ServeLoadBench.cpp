@@ -197,6 +197,7 @@ int main(int argc, char** argv) {
     const pid_t ptpd = network.processIds()[2];
     std::optional<double> stopped, continued, vanished, back;
     std::uint64_t seen = 0;
+    std::vector<long> rss;  // at each quarter of the run
     while (Clock::now() - start < std::chrono::seconds(seconds)) {
         std::this_thread::sleep_for(200ms);
         const double now = std::chrono::duration<double>(Clock::now() - start).count();
@@ -206,6 +207,10 @@ int main(int argc, char** argv) {
         } else if (stopped && !continued && Clock::now() >= at(0.5, seconds)) {
             ::kill(ptpd, SIGCONT);
             continued = now;
+        }
+        if (rss.size() < 4 &&
+            Clock::now() >= at(0.25 * static_cast<double>(rss.size() + 1), seconds)) {
+            rss.push_back(processOf(serve.pid()).rssKilobytes);
         }
         if (stopped && !vanished && sawEvent(http, "vanished", seen)) {
             vanished = now;
@@ -239,10 +244,14 @@ int main(int argc, char** argv) {
         "  ptpd stopped at %.1f s, reported vanished at %.1f s; continued at %.1f s, "
         "reported back at %.1f s\n",
         when(stopped), when(vanished), when(continued), when(back));
+    std::printf("  server: RSS %ld KiB at the start, at each quarter:", atStart.rssKilobytes);
+    for (const long kilobytes : rss) {
+        std::printf(" %ld", kilobytes);
+    }
     std::printf(
-        "  server: RSS %ld KiB at the start, %ld KiB at the end; open descriptors %zu, %zu; "
+        " KiB, %ld KiB at the end; open descriptors %zu at the start, %zu at the end; "
         "exit code %d after SIGTERM\n",
-        atStart.rssKilobytes, atEnd.rssKilobytes, atStart.descriptors, atEnd.descriptors, exitCode);
+        atEnd.rssKilobytes, atStart.descriptors, atEnd.descriptors, exitCode);
     std::filesystem::remove(log);
     return load.failed == 0 && vanished && back && exitCode == 0 ? 0 : 1;
 }
