@@ -85,8 +85,18 @@ ExitCode runServe(const ServeOptions& options) {
     }
     std::fprintf(stderr, "corbel serve: listening on http://%s, %s\n", listen->text().c_str(),
                  writesText(options, *token).c_str());
+    if ((listen->host == "0.0.0.0" || listen->host == "::") && options.allowHosts.empty()) {
+        std::fprintf(stderr,
+                     "corbel serve: requests must name the server as %s; give the names that "
+                     "clients use with --allow-host\n",
+                     listen->text().c_str());
+    }
     poller.start();
     std::thread http([&server] { server.serve(); });
+    // A stop before the server runs would be lost.
+    for (int i = 0; i < 500 && !server.is_running(); ++i) {
+        std::this_thread::sleep_for(std::chrono::milliseconds(10));
+    }
     int received = 0;
     sigwait(&signals, &received);
     std::fprintf(stderr, "corbel serve: stopping (%s)\n",
