@@ -64,6 +64,7 @@ class CPtpSysExpert : public IkxSysExpert2,
 
   private:
     nQVPTPMGMT000::tPTPMgmtNode* openNode() const { return node_.load(std::memory_order_acquire); }
+    bool chooseInterfaces();
     bool refreshClockList();
     HRESULT itemBag(const std::u16string& name, IkxSysPropertyBag2** bag);
 

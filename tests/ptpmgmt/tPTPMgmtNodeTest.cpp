@@ -65,7 +65,7 @@ class tPTPMgmtNodeTest : public ::testing::Test {
                                                  tStatus* status = nullptr) {
         return node_.sendAndAwait(tPortIdentity(clockIdentity(1), 1),
                                   std::make_unique<nQVPTP000::tPriority1TLV>(), action, timeoutMs,
-                                  0, status ? *status : status_);
+                                  0, nQVPTP000::kEveryInterface, status ? *status : status_);
     }
 
     tStatus status_;
@@ -172,7 +172,7 @@ TEST_F(tPTPMgmtNodeTest, AnswersThatDoNotFitTheRequestEndTheExchange) {
             tStatus status;
             EXPECT_FALSE(node_.sendAndAwait(tPortIdentity(clockIdentity(1), 1),
                                             std::make_unique<nQVPTP000::tNullManagementTLV>(),
-                                            action, 5000, 0, status));
+                                            action, 5000, 0, nQVPTP000::kEveryInterface, status));
             EXPECT_EQ(status.code, kStatusNoData) << "action " << action;
         }
     }
