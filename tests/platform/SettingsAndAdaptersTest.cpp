@@ -5,10 +5,12 @@
 #include <fstream>
 #include <string>
 
+#include "platform/DiscoveryInterfaces.h"
 #include "platform/EthernetAdapters.h"
 #include "platform/FindClocksTimeout.h"
 #include "platform/SettingsStore.h"
 
+using qv::dsc::osdep::DiscoveryInterfaces;
 using qv::dsc::osdep::EthernetAdapters;
 using qv::dsc::osdep::FindClocksTimeout;
 using qv::dsc::osdep::SettingsStore;
@@ -27,10 +29,10 @@ class SettingsTest : public ::testing::Test {
         unsetenv(SettingsStore::kRootVariable);
         std::filesystem::remove_all(root_);
     }
-    void store(const std::string& text) {
+    void store(const std::string& text, const char* value = "findClocksTimeout") {
         const std::filesystem::path folder = root_ + "/Software/Quarvel/Corbel/qv-1588";
         std::filesystem::create_directories(folder);
-        std::ofstream(folder / "findClocksTimeout") << text;
+        std::ofstream(folder / value) << text;
     }
 
     std::string root_;
@@ -54,6 +56,47 @@ TEST_F(SettingsTest, TextThatIsNoNumberGivesTheDefault) {
     }
     const SettingsStore key(FindClocksTimeout::kKeyPath);
     EXPECT_FALSE(key.readNumber("../qv-1588/findClocksTimeout").has_value());
+}
+
+TEST_F(SettingsTest, InterfacesComeFromTheVariableBeforeTheStoredValue) {
+    store("br1\n", DiscoveryInterfaces::kValueName);
+    for (const auto& [variable, expected] :
+         {std::pair<const char*, const char*>{nullptr, "br1\n"}, {"", "br1\n"}, {"all", "all"}}) {
+        variable != nullptr ? setenv(DiscoveryInterfaces::kVariable, variable, 1)
+                            : unsetenv(DiscoveryInterfaces::kVariable);
+        EXPECT_EQ(DiscoveryInterfaces::read(), expected);
+    }
+    unsetenv(DiscoveryInterfaces::kVariable);
+}
+
+TEST(DiscoveryInterfacesTest, NamesOrIndexesChooseInTheSystemsOrderAndAnUnknownOneChoosesNone) {
+    const std::vector<qv::dsc::osdep::MulticastInterface> available = {
+        {"eth0", 2, 1}, {"eth1", 3, 2}, {"wlan0", 5, 3}};
+    const struct {
+        const char* setting;
+        std::vector<std::uint32_t> chosen;
+        std::string unknown;
+    } cases[] = {{"", {}, ""},
+                 {" ,\t", {}, ""},
+                 {"all", {2, 3, 5}, ""},
+                 {"eth1", {3}, ""},
+                 {"wlan0,eth0", {2, 5}, ""},
+                 {"5 eth0 5", {2, 5}, ""},
+                 {"eth0 eth9", {}, "eth9"},
+                 {"4", {}, "4"},
+                 {"99999999999", {}, "99999999999"}};
+    for (const auto& c : cases) {
+        std::string unknown;
+        std::vector<std::uint32_t> chosen;
+        for (const auto& interface : DiscoveryInterfaces::choose(c.setting, available, unknown)) {
+            chosen.push_back(interface.index);
+        }
+        EXPECT_EQ(chosen, c.chosen) << c.setting;
+        EXPECT_EQ(unknown, c.unknown) << c.setting;
+    }
+    for (const auto& interface : qv::dsc::osdep::MulticastInterfaces::list()) {
+        EXPECT_NE(interface.name, "lo");  // never loopback
+    }
 }
 
 TEST(EthernetAdaptersTest, ClockIdentityIsEui64OfTheAddress) {

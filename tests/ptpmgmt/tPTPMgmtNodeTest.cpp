@@ -45,9 +45,10 @@ class tPTPMgmtNodeTest : public ::testing::Test {
         ASSERT_TRUE(status_.succeeded());
     }
 
-    SimulatedClock& addClock(std::uint8_t last, std::uint16_t ports = 1, std::uint8_t domain = 0) {
+    SimulatedClock& addClock(std::uint8_t last, std::uint16_t ports = 1, std::uint8_t domain = 0,
+                             nQVPTP000::tInterfaceIndex on = nQVPTP000::kEveryInterface) {
         clocks_.push_back(std::make_unique<SimulatedClock>(clockIdentity(last), ports, domain));
-        network_.attach(*clocks_.back());
+        network_.attach(*clocks_.back(), on);
         return *clocks_.back();
     }
     std::vector<tPTPClockProxy*> proxies() {
@@ -133,6 +134,22 @@ TEST_F(tPTPMgmtNodeTest, ALaterDiscoveryRefreshesDescriptionsAndKeepsSilentClock
     EXPECT_EQ(proxies(), before);  // the same proxies
     EXPECT_EQ(productOf(*before[0]), "new");
     EXPECT_EQ(productOf(*before[1]), "second");
+    EXPECT_TRUE(status_.succeeded());
+}
+
+// A port on two networks is one proxy, reached through the interface of its first answer.
+TEST_F(tPTPMgmtNodeTest, EachPortIsAskedThroughTheInterfaceItAnsweredOnFirst) {
+    network_.attach(addClock(1, 1, 0, 7), 9);
+    addClock(2, 1, 0, 9);
+    node_.findClocks(kDiscoveryMs, status_);
+    const auto found = proxies();
+    ASSERT_EQ(found.size(), 2U);
+    for (tPTPClockProxy* proxy : found) {
+        proxy->getPriority1(status_);
+    }
+    const auto via = network_.sentVia();
+    EXPECT_EQ(std::vector(via.end() - 2, via.end()),
+              (std::vector<nQVPTP000::tInterfaceIndex>{7, 9}));
     EXPECT_TRUE(status_.succeeded());
 }
 

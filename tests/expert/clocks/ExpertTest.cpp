@@ -41,6 +41,38 @@ TEST_F(ExpertFixture, ListingsRefreshEveryTimeAndAnItemLookupOnlyForAnUnknownNam
     lonely->Shutdown();
 }
 
+// An unknown name is asked for by name alone; its answer ends the wait (the datagram due at
+// the end of a 65535 ms wait is still on its way), silence ends it with "not found", and
+// the clocks known stay known.
+TEST_F(ExpertFixture, AnUnknownNameIsAskedForByNameAndItsAnswerEndsTheWait) {
+    SimulatedClock later(identity(0x56));
+    SimulatedNetwork own;  // the fixture's expert reads `network`
+    own.attach(later);
+    own.attach(clock);
+    auto patient = newExpert(own, 65535);
+    own.inject({0}, std::chrono::milliseconds(65535));
+    CQVComPtr<IkxSysPropertyBag> bag;
+    const char16_t* names[] = {u"02-11-22-FF-FE-33-44-56:1", kPort1};
+    for (const char16_t* name : names) {
+        EXPECT_EQ(patient->GetItem(name, bag.Receive()), S_OK);
+    }
+    EXPECT_EQ(own.queuedCount(), 1U);
+    const kxSysAttributeTagID tag = kxQvPriority1;
+    EXPECT_EQ(patient->GetItemProperties(names[0], 1, &tag, nullptr, bag.Receive()), S_OK);
+    const auto sent = own.sentDatagrams();
+    ASSERT_EQ(sent.size(), 2 * kDiscovery.size() + 1);
+    for (std::size_t i = 0; i < kDiscovery.size(); ++i) {
+        EXPECT_EQ(decodeManagement(sent[i])->getTargetPortIdentity(),
+                  tPortIdentity(identity(0x56), 1));
+    }
+    patient->Shutdown();
+
+    EXPECT_EQ(expert->GetItem(u"02-11-22-FF-FE-33-44-57:1", bag.Receive()),
+              CORBEL_E_ITEM_NOT_FOUND);
+    EXPECT_EQ(newRequests(), kDiscovery);
+    EXPECT_EQ(read({kxQvPriority1}, bag), S_OK);
+}
+
 // Misuse gives a clear code, and a refused read says why to the calling thread.
 TEST_F(ExpertFixture, MisuseIsRefusedAndAFailureSaysWhy) {
     CQVComObject<CPtpSysExpert>* fresh = nullptr;

@@ -2,8 +2,10 @@
 
 #include <dlfcn.h>
 
+#include <chrono>
 #include <cstdio>
 #include <sstream>
+#include <thread>
 
 namespace qvtest {
 
@@ -27,8 +29,9 @@ LoadedExpert::~LoadedExpert() {
 
 std::map<std::string, std::string> pmcValues(const TestNetwork& network, const TestClock& clock,
                                              const std::string& managementId) {
-    const CommandResult result = network.runInClient(
-        "pmc -4 -i br0 -b 0 -d " + std::to_string(clock.domain) + " 'GET " + managementId + "'");
+    const CommandResult result =
+        network.runInClient("pmc -4 -i " + clock.bridge + " -b 0 -d " +
+                            std::to_string(clock.domain) + " 'GET " + managementId + "'");
     std::map<std::string, std::string> values;
     std::istringstream lines(result.output);
     for (std::string line; std::getline(lines, line);) {
@@ -40,6 +43,37 @@ std::map<std::string, std::string> pmcValues(const TestNetwork& network, const T
         }
     }
     return values;
+}
+
+std::vector<std::string> requestsSentDuring(const TestNetwork& network,
+                                            const std::vector<std::string>& bridges,
+                                            const std::function<void()>& action) {
+    std::vector<std::thread> captures;
+    std::vector<std::string> files, requests;
+    for (const std::string& bridge : bridges) {
+        files.push_back("/tmp/qv-expert-" + network.prefix() + "-" + bridge + ".pcap");
+        captures.emplace_back([&network, &bridge, file = files.back()] {
+            network.runInClient("timeout 3 tcpdump -U -i " + bridge + " -w " + file +
+                                " udp port 320");
+        });
+    }
+    for (const std::string& file : files) {
+        for (int i = 0; i < 100 && runCommand("test -s " + file).exitStatus != 0; ++i) {
+            std::this_thread::sleep_for(std::chrono::milliseconds(20));
+        }
+    }
+    action();
+    for (std::thread& capture : captures) {
+        capture.join();
+    }
+    for (const std::string& file : files) {
+        requests.push_back(runCommand("tshark -r " + file +
+                                      " -Y 'ptp.v2.mm.action == 1 || ptp.v2.mm.action == 3' -T "
+                                      "fields -e ptp.v2.mm.managementId 2>/dev/null; rm -f " +
+                                      file)
+                               .output);
+    }
+    return requests;
 }
 
 std::u16string itemNameOf(const TestClock& clock) {
