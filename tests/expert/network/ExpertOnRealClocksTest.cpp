@@ -3,9 +3,11 @@
 #include <dirent.h>
 #include <gtest/gtest.h>
 
+#include <chrono>
 #include <functional>
 #include <map>
 #include <string>
+#include <thread>
 #include <tuple>
 #include <vector>
 
@@ -18,6 +20,7 @@
 namespace {
 
 using namespace qvtest;
+using namespace std::chrono_literals;
 using tValues = std::map<std::string, std::string>;
 
 // One form for pmc's text and ours: the last word, 0x numbers as decimal, no ".0" ending,
@@ -96,17 +99,10 @@ TEST(ExpertOnRealClocks, FindsReadsWritesAndLeavesNothingBehind) {
     ASSERT_EQ(create(&expert), S_OK);
     ASSERT_EQ(expert->Initialize(), S_OK);
     std::vector<std::u16string> expected;
-    std::vector<std::u16string> found;
     for (const TestClock& clock : network.clocks()) {
         expected.push_back(itemNameOf(clock));
     }
-    IkxSysEnumStringList* names = nullptr;
-    ASSERT_EQ(expert->GetItemNames(&names), S_OK);
-    for (BSTR name = nullptr; names->Next(1, &name, nullptr) == S_OK; SysFreeString(name)) {
-        found.emplace_back(name);
-    }
-    names->Release();
-    EXPECT_EQ(found, expected);
+    EXPECT_EQ(itemNames(*expert), expected);
 
     // ptp4l refuses TIME and UTC_PROPERTIES: the read fails, the rest is in the bag.
     const std::vector<kxSysAttributeTagID> readable = readableTags();
@@ -124,24 +120,8 @@ TEST(ExpertOnRealClocks, FindsReadsWritesAndLeavesNothingBehind) {
         }
         bag->Release();
     }
-    // Validates and applies what `change` sets in a bag of the expert's own.
-    auto write = [&](const TestClock& clock,
-                     const std::function<void(IkxSysPropertyBag2&)>& change) {
-        IkxSysPropertyBag* bag = nullptr;
-        IkxSysPropertyBag2* changes = nullptr;
-        EXPECT_EQ(expert->GetItem(itemNameOf(clock).c_str(), &bag), S_OK);
-        bag->QueryInterface(IID_IkxSysPropertyBag2, reinterpret_cast<void**>(&changes));
-        changes->ClearChangedTags();
-        change(*changes);
-        IkxSysEnumPropertyTag* accepted = nullptr;
-        BSTR message = nullptr;
-        EXPECT_EQ(expert->ValidateChanges(nullptr, bag, &accepted, &message), S_OK);
-        SysFreeString(message);
-        accepted->Release();
-        const HRESULT result = expert->ApplyChanges(itemNameOf(clock).c_str(), bag, nullptr);
-        changes->Release();
-        bag->Release();
-        return result;
+    auto write = [&](const TestClock& clock, const tChange& change) {
+        return writeChanges(*expert, itemNameOf(clock), change);
     };
     const TestClock& ptpd = network.clocks()[0];
     EXPECT_EQ(write(ptpd,

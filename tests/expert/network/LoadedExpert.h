@@ -35,6 +35,14 @@ class LoadedExpert {
 std::map<std::string, std::string> pmcValues(const TestNetwork& network, const TestClock& clock,
                                              const std::string& managementId);
 
+// The item names that GetItemNames gives (none when it finds no clock).
+std::vector<std::u16string> itemNames(IkxSysExpert2& expert);
+
+// Validates and applies what `change` sets in the bag that GetItem gives for `item`; the
+// result of ApplyChanges, or GetItem's failure.
+using tChange = std::function<void(IkxSysPropertyBag2&)>;
+HRESULT writeChanges(IkxSysExpert2& expert, const std::u16string& item, const tChange& change);
+
 // The management ids (decimal, one a line) of every SET and COMMAND that went out on each of
 // the client's `bridges` while `action` ran, in the order of `bridges`.
 std::vector<std::string> requestsSentDuring(const TestNetwork& network,

@@ -68,9 +68,6 @@ TEST(DiscoveryInterfacesWin32Test, ReadsTheTextValueBesideTheTimeout) {
     const wchar_t text[] = L"Ethernet,12";
     value.set(REG_SZ, text, sizeof(text));
     EXPECT_EQ(qv::dsc::osdep::DiscoveryInterfaces::read(), "Ethernet,12");
-    for (const auto& interface : qv::dsc::osdep::MulticastInterfaces::list()) {
-        EXPECT_NE(interface.address, 0U) << interface.name;
-    }
 }
 
 TEST(MutexWin32Test, FindMutexLivesInTheNamespaceOfAllSessions) {

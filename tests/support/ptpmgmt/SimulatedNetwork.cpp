@@ -20,8 +20,7 @@ void SimulatedNetwork::open(tStatus& status) {
 // The clocks answer on the sending thread, outside the network's lock (each clock has its
 // own), so that exchanges with different clocks run side by side. Running out of memory is
 // reported as a transport would, with -52000.
-void SimulatedNetwork::send(tProtocolDataUnit& unit, nQVPTP000::tInterfaceIndex via,
-                            tStatus& status) {
+void SimulatedNetwork::send(tProtocolDataUnit& unit, tStatus& status, tIndex via) {
     if (status.failed()) {
         return;
     }
@@ -29,7 +28,7 @@ void SimulatedNetwork::send(tProtocolDataUnit& unit, nQVPTP000::tInterfaceIndex 
     // allocations fail does not reach theirs.
     const AllocationFailurePause otherMachines;
     try {
-        std::vector<std::pair<SimulatedClock*, nQVPTP000::tInterfaceIndex>> clocks;
+        std::vector<std::pair<SimulatedClock*, tIndex>> clocks;
         {
             std::lock_guard<std::mutex> guard(lock_);
             const bool fails = failingSends_ > 0 && sendsBeforeFailure_ == 0;
@@ -92,7 +91,7 @@ std::vector<std::vector<std::uint8_t>> SimulatedNetwork::sentDatagrams() const {
     return sent_;
 }
 
-std::vector<nQVPTP000::tInterfaceIndex> SimulatedNetwork::sentVia() const {
+std::vector<SimulatedNetwork::tIndex> SimulatedNetwork::sentVia() const {
     std::lock_guard<std::mutex> guard(lock_);
     return sentVia_;
 }

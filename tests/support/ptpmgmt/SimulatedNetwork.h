@@ -25,10 +25,11 @@ namespace qvtest {
 class SimulatedNetwork final : public nQVPTP000::iPTPPortMessaging {
   public:
     using tClock = std::chrono::steady_clock;
+    using tIndex = nQVPTP000::tInterfaceIndex;
     static constexpr std::size_t kMaxDatagram = 1024;
 
     // The clock stays the caller's and must outlive the network's use.
-    void attach(SimulatedClock& clock, nQVPTP000::tInterfaceIndex on = nQVPTP000::kEveryInterface) {
+    void attach(SimulatedClock& clock, tIndex on = nQVPTP000::kEveryInterface) {
         std::lock_guard<std::mutex> guard(lock_);
         clocks_.emplace_back(&clock, on);
     }
@@ -38,17 +39,12 @@ class SimulatedNetwork final : public nQVPTP000::iPTPPortMessaging {
         open_.store(false);
         wake();
     }
-    void sendEventMessage(nQVPTP000::tProtocolDataUnit& u, tStatus& s) override {
-        send(u, nQVPTP000::kEveryInterface, s);
+    void sendEventMessage(nQVPTP000::tProtocolDataUnit& u, tStatus& s) override { send(u, s); }
+    void sendGeneralMessage(nQVPTP000::tProtocolDataUnit& u, tStatus& s) override { send(u, s); }
+    void sendGeneralMessageVia(nQVPTP000::tProtocolDataUnit& u, tIndex via, tStatus& s) override {
+        send(u, s, via);
     }
-    void sendGeneralMessage(nQVPTP000::tProtocolDataUnit& u, tStatus& s) override {
-        send(u, nQVPTP000::kEveryInterface, s);
-    }
-    void sendGeneralMessageVia(nQVPTP000::tProtocolDataUnit& u, nQVPTP000::tInterfaceIndex via,
-                               tStatus& s) override {
-        send(u, via, s);
-    }
-    nQVPTP000::tInterfaceIndex getReceiveInterface() const override { return lastInterface_; }
+    tIndex getReceiveInterface() const override { return lastInterface_; }
     void receive(nQVPTP000::tProtocolDataUnit& unit, tStatus& status) override;
     void abortReceive(tStatus&) override {
         abortRequested_.store(true);
@@ -70,15 +66,16 @@ class SimulatedNetwork final : public nQVPTP000::iPTPPortMessaging {
     std::vector<std::vector<std::uint8_t>> sentDatagrams() const;
     std::size_t sentCount() const { return sentDatagrams().size(); }
     // The interface each of them was sent through (kEveryInterface: all).
-    std::vector<nQVPTP000::tInterfaceIndex> sentVia() const;
+    std::vector<tIndex> sentVia() const;
     // Datagrams waiting for receive (delayed answers included).
     std::size_t queuedCount() const;
     bool isOpen() const { return open_.load(); }
 
   private:
-    using tArrival = std::pair<std::vector<std::uint8_t>, nQVPTP000::tInterfaceIndex>;
+    using tArrival = std::pair<std::vector<std::uint8_t>, tIndex>;
 
-    void send(nQVPTP000::tProtocolDataUnit& unit, nQVPTP000::tInterfaceIndex via, tStatus& status);
+    void send(nQVPTP000::tProtocolDataUnit& unit, tStatus& status,
+              tIndex via = nQVPTP000::kEveryInterface);
     void push(tArrival arrival, tClock::time_point due);
     // Waits until the earliest datagram is due and takes it; false once closed or aborted.
     bool pop(tArrival& arrival);
@@ -87,14 +84,14 @@ class SimulatedNetwork final : public nQVPTP000::iPTPPortMessaging {
     mutable std::mutex lock_;
     std::condition_variable changed_;
     // Each clock and the interface it sits on; guarded by lock_.
-    std::vector<std::pair<SimulatedClock*, nQVPTP000::tInterfaceIndex>> clocks_;
+    std::vector<std::pair<SimulatedClock*, tIndex>> clocks_;
     std::vector<std::vector<std::uint8_t>> sent_;            // guarded by lock_
-    std::vector<nQVPTP000::tInterfaceIndex> sentVia_;        // guarded by lock_
+    std::vector<tIndex> sentVia_;                            // guarded by lock_
     std::size_t sendsBeforeFailure_ = 0, failingSends_ = 0;  // guarded by lock_
     // Answers by due time, in arrival order among equal times; guarded by lock_.
     std::multimap<tClock::time_point, tArrival> arrivals_;
     std::atomic<bool> open_{false}, abortRequested_{false};
-    nQVPTP000::tInterfaceIndex lastInterface_ = nQVPTP000::kEveryInterface;  // receiver's only
+    tIndex lastInterface_ = nQVPTP000::kEveryInterface;  // the receiving thread's only
 };
 
 }  // namespace qvtest
