@@ -22,7 +22,8 @@ class tPTPClockProxy;
 // CLOCK_DESCRIPTION, keeps one proxy per answering port, and carries out every
 // request/response exchange that a proxy asks for.
 //
-// Lock order: clockListLock_, then requestLock_, then the transceiver's locks.
+// Lock order: clockListLock_, then requestLock_, then the transceiver's locks. askClock
+// sends under requestLock_ alone and takes clockListLock_ only once its wait is over.
 class tPTPMgmtNode final : public iPTPMgmtNode {
   public:
     static constexpr std::uint8_t kDiscoveryDomains = 4;

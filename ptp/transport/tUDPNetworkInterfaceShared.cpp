@@ -5,8 +5,7 @@
 
 // The parts of the UDP interface that are the same on every system: padding of event
 // messages for compatible peers, the choice of send sockets, the abort flag, and closing
-// once no receive runs. The
-// sockets themselves are in tUDPNetworkInterface.cpp (POSIX) and
+// once no receive runs. The sockets themselves are in tUDPNetworkInterface.cpp (POSIX) and
 // tUDPNetworkInterfaceWin32.cpp (Winsock).
 namespace nQVPTP000 {
 
