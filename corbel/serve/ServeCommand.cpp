@@ -61,13 +61,16 @@ ExitCode runServe(const ServeOptions& options) {
                       ", which is not loopback, needs a token: --token-file FILE or the "
                       "environment variable CORBEL_SERVE_TOKEN (or --read-only)");
     }
+    const DiscoveryWait wait(options.waitMilliseconds);
+    ExpertSession session(options.expertPath);
+    if (!session.isReady()) {
+        return refuse(session.failure(), ExitCode::kNoExpert);
+    }
+    // Before the expert's receive thread starts.
     const sigset_t signals = endSignals();
     pthread_sigmask(SIG_BLOCK, &signals, nullptr);
     std::signal(SIGPIPE, SIG_IGN);  // a client gone mid-answer is an error, not an end
-
-    const DiscoveryWait wait(options.waitMilliseconds);
-    ExpertSession session(options.expertPath);
-    if (!session.isReady() || !session.initialize()) {
+    if (!session.initialize()) {
         return refuse(session.failure(), ExitCode::kNoExpert);
     }
     ServiceState state;

@@ -2,6 +2,7 @@
 
 #include <nlohmann/json.hpp>
 
+#include "corbel/serve/ServeCommand.h"
 #include "tests/corbel/serve/FakeService.h"
 
 // The routes of corbel serve against a published state, without network or poller.
@@ -211,3 +212,31 @@ TEST(ServeApi, ServesMetricsInThePrometheusTextFormat) {
 }
 
 }  // namespace
+
+TEST(ServeStart, RefusesWhatCannotBeServedSafelyBeforeLoadingTheExpert) {
+    ::unsetenv("CORBEL_SERVE_TOKEN");
+    const struct {
+        std::string listen, tokenFile;
+        bool readOnly;
+        corbel::ExitCode code;
+    } cases[] = {
+        {"10.0.0.1:8588", "", false, corbel::ExitCode::kBadUsage},  // not loopback, no token
+        {"0.0.0.0:8588", "", false, corbel::ExitCode::kBadUsage},
+        {"127.0.0.1", "", false, corbel::ExitCode::kBadUsage},
+        {"[::1:8588", "", false, corbel::ExitCode::kBadUsage},
+        {"127.0.0.1:65536", "", false, corbel::ExitCode::kBadUsage},
+        {"127.0.0.1:8588", "/nonexistent/token", false, corbel::ExitCode::kBadUsage},
+        // Past the checks: it goes on to load the expert, which is not there.
+        {"10.0.0.1:8588", "", true, corbel::ExitCode::kNoExpert},
+        {"[::1]:8588", "", false, corbel::ExitCode::kNoExpert},
+    };
+    for (const auto& test : cases) {
+        SCOPED_TRACE(test.listen + " " + test.tokenFile);
+        corbel::ServeOptions options;
+        options.expertPath = "/nonexistent/libqv1588.so";
+        options.listen = test.listen;
+        options.tokenFile = test.tokenFile;
+        options.readOnly = test.readOnly;
+        EXPECT_EQ(corbel::runServe(options), test.code);
+    }
+}
