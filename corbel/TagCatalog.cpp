@@ -20,6 +20,20 @@ std::span<const TagInfo> allTags() {
     return kxQvAttributes;
 }
 
+std::vector<const TagInfo*> tagsInOrder() {
+    std::vector<const TagInfo*> tags;
+    for (const TagInfo& info : kxQvAttributes) {
+        tags.push_back(&info);
+    }
+    std::ranges::sort(tags, {}, &TagInfo::tag);
+    return tags;
+}
+
+std::string tagName(kxSysAttributeTagID tag) {
+    const TagInfo* info = findTag(tag);
+    return info != nullptr ? info->name : tagText(tag);
+}
+
 const TagInfo* findTag(kxSysAttributeTagID tag) {
     return kxQvFindAttribute(tag);
 }

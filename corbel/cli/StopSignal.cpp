@@ -1,0 +1,26 @@
+#include "corbel/cli/StopSignal.h"
+
+#include <csignal>
+
+namespace corbel {
+
+namespace {
+
+volatile std::sig_atomic_t stopRequested = 0;
+
+extern "C" void onStopSignal(int) {
+    stopRequested = 1;
+}
+
+}  // namespace
+
+void StopSignal::install() {
+    std::signal(SIGINT, onStopSignal);
+    std::signal(SIGTERM, onStopSignal);
+}
+
+bool StopSignal::requested() {
+    return stopRequested != 0;
+}
+
+}  // namespace corbel
