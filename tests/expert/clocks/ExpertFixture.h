@@ -8,6 +8,7 @@
 #include <filesystem>
 #include <fstream>
 #include <string>
+#include <tuple>
 #include <vector>
 
 #include "expert/CQVComObject.h"
@@ -21,6 +22,8 @@
 namespace qvtest {
 
 using tTags = std::vector<kxSysAttributeTagID>;
+// What IkxQvLastFailure2 says: kind, managementErrorId, tag.
+using tCause = std::tuple<kxQvFailureKind, ULONG, kxSysAttributeTagID>;
 using tExpert = CQVComPtr<CQVComObject<CPtpSysExpert>>;
 
 // A host's item collector that keeps the item names it is given.
@@ -84,6 +87,26 @@ class ExpertFixture : public ::testing::Test {
     HRESULT read(const tTags& tags, CQVComPtr<IkxSysPropertyBag>& bag) {
         return expert->GetItemProperties(kPort1, static_cast<ULONG>(tags.size()), tags.data(),
                                          nullptr, bag.Receive());
+    }
+    // Why the calling thread's last operation failed, in words (ASCII) and as numbers.
+    std::string lastFailure() {
+        CQVComPtr<IkxQvLastFailure2> failure;
+        EXPECT_EQ(expert->QueryInterface(IID_IkxQvLastFailure2,
+                                         reinterpret_cast<void**>(failure.Receive())),
+                  S_OK);
+        BSTR description = nullptr;
+        failure->GetLastFailure(&description, nullptr);
+        const std::u16string text(description != nullptr ? description : u"");
+        SysFreeString(description);
+        return std::string(text.begin(), text.end());
+    }
+    tCause lastCause() {
+        ULONG kind = 0;
+        tCause cause;
+        static_cast<IkxQvLastFailure2*>(expert.get())
+            ->GetLastFailureCause(&kind, &std::get<1>(cause), &std::get<2>(cause));
+        std::get<0>(cause) = static_cast<kxQvFailureKind>(kind);
+        return cause;
     }
     // The management ids of the requests sent since the last call.
     std::vector<std::uint16_t> newRequests() {
