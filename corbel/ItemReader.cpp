@@ -34,6 +34,18 @@ ExitCode ItemReading::outcome(bool tagsNamed) const {
     return ExitCode::kSuccess;
 }
 
+std::vector<kxSysAttributeTagID> ItemReading::tagsInOrder() const {
+    std::vector<kxSysAttributeTagID> tags;
+    for (const auto& [tag, value] : values) {
+        tags.push_back(tag);
+    }
+    for (const auto& [tag, cause] : unread) {
+        tags.push_back(tag);
+    }
+    std::ranges::sort(tags, {}, catalogOrder);
+    return tags;
+}
+
 ItemReading ItemReader::read(const std::string& item,
                              const std::vector<kxSysAttributeTagID>& wanted, bool withBase) const {
     ItemReading reading{item, std::nullopt, {}, {}};

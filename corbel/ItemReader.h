@@ -27,6 +27,9 @@ struct ItemReading {
     // did not answer or refused for another reason than lacking the data, and, with
     // `tagsNamed` (the user asked for these tags), when any tag is missing.
     ExitCode outcome(bool tagsNamed) const;
+
+    // The tags read and unread, in the order in which views list them (catalogOrder).
+    std::vector<kxSysAttributeTagID> tagsInOrder() const;
 };
 
 // Reads items through an expert, one request per group of tags (ReadGroups), so that a

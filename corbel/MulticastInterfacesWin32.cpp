@@ -37,10 +37,9 @@ std::vector<std::string> MulticastInterfaces::names() {
     if (result != NO_ERROR) {
         return names;
     }
-    for (auto* adapter = reinterpret_cast<IP_ADAPTER_ADDRESSES*>(buffer.data());
-         adapter != nullptr; adapter = adapter->Next) {
-        if (adapter->OperStatus == IfOperStatusUp &&
-            adapter->IfType != IF_TYPE_SOFTWARE_LOOPBACK &&
+    for (auto* adapter = reinterpret_cast<IP_ADAPTER_ADDRESSES*>(buffer.data()); adapter != nullptr;
+         adapter = adapter->Next) {
+        if (adapter->OperStatus == IfOperStatusUp && adapter->IfType != IF_TYPE_SOFTWARE_LOOPBACK &&
             (adapter->Flags & IP_ADAPTER_NO_MULTICAST) == 0 &&
             adapter->FirstUnicastAddress != nullptr) {
             names.push_back(utf8Of(adapter->FriendlyName));

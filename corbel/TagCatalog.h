@@ -15,6 +15,10 @@ using TagInfo = kxQvAttribute;
 
 std::span<const TagInfo> allTags();
 
+// Where a tag stands in the expert's table, which lists them by dataset: the order in
+// which views list an item's tags. Unknown tags come last.
+std::size_t catalogOrder(kxSysAttributeTagID tag);
+
 // Every tag in ascending tag order: the order in which ApplyChanges writes them.
 std::vector<const TagInfo*> tagsInOrder();
 

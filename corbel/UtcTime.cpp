@@ -1,5 +1,6 @@
 #include "corbel/UtcTime.h"
 
+#include <algorithm>
 #include <chrono>
 #include <cmath>
 #include <cstdint>
@@ -28,8 +29,8 @@ std::int64_t daysSince1970(const Date& date) {
     const std::int64_t year = date.year - (date.month <= 2 ? 1 : 0);
     const std::int64_t era = (year >= 0 ? year : year - 399) / 400;
     const auto yearOfEra = static_cast<unsigned>(year - era * 400);
-    const unsigned dayOfYear = (153 * (date.month > 2 ? date.month - 3 : date.month + 9) + 2) / 5 +
-                               date.day - 1;
+    const unsigned dayOfYear =
+        (153 * (date.month > 2 ? date.month - 3 : date.month + 9) + 2) / 5 + date.day - 1;
     const unsigned dayOfEra = yearOfEra * 365 + yearOfEra / 4 - yearOfEra / 100 + dayOfYear;
     return era * 146097 + dayOfEra - 719468;
 }
@@ -51,8 +52,10 @@ std::uint64_t fractionOfNanoseconds(std::uint32_t nanoseconds) {
     return static_cast<std::uint64_t>(std::ldexp(static_cast<long double>(nanoseconds) / 1e9L, 64));
 }
 
+// To the nearest nanosecond, so that a fraction made from nanoseconds gives them back.
 std::uint32_t nanosecondsOfFraction(std::uint64_t fraction) {
-    return static_cast<std::uint32_t>(std::ldexp(static_cast<long double>(fraction), -64) * 1e9L);
+    const long double nanoseconds = std::ldexp(static_cast<long double>(fraction), -64) * 1e9L;
+    return static_cast<std::uint32_t>(std::min(std::round(nanoseconds), 999999999.0L));
 }
 
 // Takes `minimum` to `maximum` decimal digits from the front of `text`.
@@ -86,7 +89,8 @@ std::optional<std::uint32_t> takeFraction(std::string_view& text) {
     }
     std::uint32_t nanoseconds = 0;
     for (std::size_t i = 0; i < 9; ++i) {
-        nanoseconds = nanoseconds * 10 + (i < digits.size() ? static_cast<std::uint32_t>(digits[i] - '0') : 0u);
+        nanoseconds = nanoseconds * 10 +
+                      (i < digits.size() ? static_cast<std::uint32_t>(digits[i] - '0') : 0u);
     }
     text.remove_prefix(digits.size());
     return nanoseconds;
@@ -111,8 +115,8 @@ std::optional<Fields> fieldsOf(std::string_view text) {
     const auto minute = takeDigits(text, 2, 2);
     const bool colon2 = takeOneOf(text, ":");
     const auto second = takeDigits(text, 2, 2);
-    if (!year || !dash1 || !month || !dash2 || !day || !separator || !hour || !colon1 ||
-        !minute || !colon2 || !second || *hour > 23 || *minute > 59 || *second > 59) {
+    if (!year || !dash1 || !month || !dash2 || !day || !separator || !hour || !colon1 || !minute ||
+        !colon2 || !second || *hour > 23 || *minute > 59 || *second > 59) {
         return std::nullopt;
     }
     if (takeOneOf(text, ".")) {
@@ -139,7 +143,8 @@ std::optional<Fields> fieldsOf(std::string_view text) {
 
 std::string formatUtc(const kxSysAttrTimestampUTC& time) {
     const std::int64_t seconds = time.seconds - kUnixEpochSince1904;
-    const std::int64_t days = (seconds >= 0 ? seconds : seconds - kSecondsPerDay + 1) / kSecondsPerDay;
+    const std::int64_t days =
+        (seconds >= 0 ? seconds : seconds - kSecondsPerDay + 1) / kSecondsPerDay;
     const std::int64_t ofDay = seconds - days * kSecondsPerDay;
     const Date date = dateOf(days);
     char text[80];
@@ -183,8 +188,9 @@ std::string lastPtpTime() {
 kxSysAttrTimestampUTC utcNow() {
     const auto since1970 = std::chrono::system_clock::now().time_since_epoch();
     const auto seconds = std::chrono::floor<std::chrono::seconds>(since1970);
-    const auto nanoseconds =
-        std::chrono::duration_cast<std::chrono::nanoseconds>(since1970 - seconds).count();
+    const auto nanoseconds = std::chrono::duration_cast<std::chrono::nanoseconds>(
+                                 std::chrono::floor<std::chrono::milliseconds>(since1970 - seconds))
+                                 .count();
     return {fractionOfNanoseconds(static_cast<std::uint32_t>(nanoseconds)),
             seconds.count() + kUnixEpochSince1904};
 }

@@ -34,7 +34,7 @@ UtcParse parseUtc(std::string_view text);
 std::string firstPtpTime();
 std::string lastPtpTime();
 
-// The host's clock now, with its sub-seconds.
+// The host's clock now, to the millisecond (what a log of samples needs).
 kxSysAttrTimestampUTC utcNow();
 
 }  // namespace corbel

@@ -1,7 +1,5 @@
 #include "corbel/ValueJson.h"
 
-#include <map>
-
 #include "corbel/TagCatalog.h"
 #include "corbel/UtcTime.h"
 #include "corbel/ValueWords.h"
@@ -61,30 +59,26 @@ nlohmann::ordered_json entryJson(kxSysAttributeTagID tag, const PropertyValue& v
 nlohmann::ordered_json unreadJson(kxSysAttributeTagID tag, const FailureCause& cause) {
     const TagInfo* info = findTag(tag);
     nlohmann::ordered_json entry = {{"tag", tagText(tag)},
-                            {"type", typeName(info != nullptr ? info->type : 0u)},
-                            {"settable", info != nullptr && info->settable},
-                            {"value", nullptr}};
+                                    {"type", typeName(info != nullptr ? info->type : 0u)},
+                                    {"settable", info != nullptr && info->settable},
+                                    {"value", nullptr}};
     entry.update(causeJson(cause));
     return entry;
 }
 
 nlohmann::ordered_json itemJson(const ItemReading& reading) {
-    std::map<kxSysAttributeTagID, nlohmann::ordered_json> entries;  // in tag order
-    for (const auto& [tag, value] : reading.values) {
-        entries[tag] = entryJson(tag, value);
-    }
-    for (const auto& [tag, cause] : reading.unread) {
-        entries[tag] = unreadJson(tag, cause);
-    }
     nlohmann::ordered_json item = nlohmann::ordered_json::object();
-    for (auto& [tag, entry] : entries) {
-        item[tagName(tag)] = std::move(entry);
+    for (const kxSysAttributeTagID tag : reading.tagsInOrder()) {
+        const auto value = reading.values.find(tag);
+        item[tagName(tag)] = value != reading.values.end()
+                                 ? entryJson(tag, value->second)
+                                 : unreadJson(tag, reading.unread.at(tag));
     }
     return item;
 }
 
 nlohmann::ordered_json changeJson(const std::string& item, const ChangeOutcome& outcome,
-                          const FailureCause& cause) {
+                                  const FailureCause& cause) {
     nlohmann::ordered_json refused = nullptr;
     if (outcome.failed) {
         refused = {{"name", tagName(*outcome.failed)}};

@@ -36,7 +36,7 @@ nlohmann::ordered_json itemJson(const ItemReading& reading);
 // What a change did: {"item", "written": [names], "refused": null or {"name", "error",
 // "reason"}, "notSent": [names], "unknown": [names]}.
 nlohmann::ordered_json changeJson(const std::string& item, const ChangeOutcome& outcome,
-                          const FailureCause& cause);
+                                  const FailureCause& cause);
 
 }  // namespace corbel
 

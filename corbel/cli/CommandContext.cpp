@@ -72,9 +72,8 @@ bool CommandContext::open(bool network, ExitCode& failed) {
         output_.error("no-expert", session_->failure());
     } else if (network && !session_->initialize()) {
         const FailureCause cause = FailureCause::last(expert(), E_FAIL);
-        output_.error("no-expert",
-                      session_->failure() +
-                          (cause.description.empty() ? "" : ": " + cause.description));
+        output_.error("no-expert", session_->failure() +
+                                       (cause.description.empty() ? "" : ": " + cause.description));
     } else {
         return true;
     }
@@ -114,11 +113,13 @@ ExitCode CommandContext::reportReading(const ItemReading& reading, bool tagsName
     for (const auto& [tag, cause] : reading.unread) {
         const auto same = std::ranges::find_if(
             reasons, [&](const auto& entry) { return entry.first->words() == cause.words(); });
-        (same != reasons.end() ? same->second : reasons.emplace_back(&cause, std::vector<std::string>{}).second)
+        (same != reasons.end() ? same->second
+                               : reasons.emplace_back(&cause, std::vector<std::string>{}).second)
             .push_back(tagName(tag));
     }
     for (const auto& [cause, names] : reasons) {
-        report(reading.item + ": cannot read " + joined(names, ", "), *cause, {{"item", reading.item}});
+        report(reading.item + ": cannot read " + joined(names, ", "), *cause,
+               {{"item", reading.item}});
     }
     return outcome;
 }
@@ -154,11 +155,11 @@ std::vector<ClockPort> CommandContext::discover(const std::string& purpose,
             found == reading.values.end() ? nullptr : std::get_if<std::uint32_t>(&found->second);
         if (domain == nullptr) {
             const auto unread = reading.unread.find(kxQvDomainNumber);
-            failed = worse(failed, report(item + ": cannot read its domain",
-                                          unread != reading.unread.end()
-                                              ? unread->second
-                                              : reading.lookupFailure.value_or(
-                                                    FailureCause::of(E_FAIL))));
+            failed = worse(failed,
+                           report(item + ": cannot read its domain",
+                                  unread != reading.unread.end()
+                                      ? unread->second
+                                      : reading.lookupFailure.value_or(FailureCause::of(E_FAIL))));
         }
         if (!options_.domain || (domain != nullptr && *domain == *options_.domain)) {
             ports.push_back({item, domain != nullptr ? std::optional(*domain) : std::nullopt});

@@ -28,18 +28,21 @@ const char* const kFooter = R"(Exit codes:
 "corbel COMMAND --help" shows a command's options; "man corbel" tells the whole story.
 Bash completes commands, options and tag names once the package is installed.)";
 
-const char* const kSetFooter = R"(What happens: the expert validates the new values first, and nothing is sent when it
+const char* const kSetFooter =
+    R"(What happens: the expert validates the new values first, and nothing is sent when it
 rejects one (exit code 3, its sentences are shown). Then it writes them to the clock, one
 request per tag in ascending tag order (the order of "corbel tags"), and stops at the
 first one that the clock refuses or does not answer: the tags before it stay written, the
 ones after it are not sent, and corbel names all three (exit code 4).)";
 
-const char* const kShowFooter = R"~(Each ITEM's tags are read from the clock one dataset at a time. A dataset the clock does
+const char* const kShowFooter =
+    R"~(Each ITEM's tags are read from the clock one dataset at a time. A dataset the clock does
 not support (ptp4l: the time and the UTC properties) shows "(not supported by this clock)"
 and the command still succeeds, unless a TAG of it was named. * marks the tags that
 "corbel set" changes. With no ITEM: every clock that answers, a row each.)~";
 
-const char* const kWatchFooter = R"(Discovers once, then reads every clock each interval. On a terminal: a live table, redrawn
+const char* const kWatchFooter =
+    R"(Discovers once, then reads every clock each interval. On a terminal: a live table, redrawn
 in place, with the changes since the last sample. Elsewhere (a pipe, a file, --json): one
 line, or one JSON object, per clock and sample, for a log or a plot. Discovers again every
 ten samples (every ten seconds at most) to notice clocks that appear; a clock that stops
@@ -72,14 +75,15 @@ CLI::Validator numberCheck(const std::string& unit, double low, double high, boo
 // stand before or after the command word, and each command's help lists its own.
 class Parser {
   public:
-    explicit Parser(Invocation& invocation) : app_(kDescription, "corbel"), options_(invocation.options) {}
+    explicit Parser(Invocation& invocation)
+        : app_(kDescription, "corbel"), options_(invocation.options) {}
 
     CLI::App& app() { return app_; }
 
     void expert(CLI::App* app) {
-        app->add_option("--expert", options_.expertPath,
-                        "the expert library to load (default: " +
-                            ExpertSession::defaultLibraryPaths() + ")")
+        app->add_option(
+               "--expert", options_.expertPath,
+               "the expert library to load (default: " + ExpertSession::defaultLibraryPaths() + ")")
             ->type_name("PATH");
     }
     void json(CLI::App* app) {
@@ -184,8 +188,8 @@ std::vector<CommandSpec> addCommands(Parser& parser, std::vector<std::string>& a
 // CLI11's words for an argument that no option takes, in ours.
 std::string usageMessage(const CLI::ParseError& error) {
     const std::string text = error.what();
-    for (const std::string_view prefix :
-         {"The following argument was not expected: ", "The following arguments were not expected: "}) {
+    for (const std::string_view prefix : {"The following argument was not expected: ",
+                                          "The following arguments were not expected: "}) {
         if (text.starts_with(prefix)) {
             const std::string word = text.substr(prefix.size());
             return (word.starts_with("-") ? "unknown option '" : "unexpected argument '") + word +
@@ -246,10 +250,9 @@ Invocation parseCommandLine(int argc, const char* const* argv) {
     const std::vector<std::string> extras = app.remaining();
     if (!extras.empty()) {
         const std::string& word = extras.front();
-        invocation.finished =
-            reportUsage(word.starts_with("-") ? "unknown option '" + word + "'"
-                                              : "unknown command '" + word + "'",
-                        "corbel --help", json);
+        invocation.finished = reportUsage(word.starts_with("-") ? "unknown option '" + word + "'"
+                                                                : "unknown command '" + word + "'",
+                                          "corbel --help", json);
         return invocation;
     }
     for (const CommandSpec& spec : commands) {

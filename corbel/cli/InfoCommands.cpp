@@ -39,8 +39,7 @@ ExitCode runInfo(const Options& options) {
         return ExitCode::kSuccess;
     }
     Table table;
-    const char* const labels[] = {"display name", "version", "short name", "identifier",
-                                  "library"};
+    const char* const labels[] = {"display name", "version", "short name", "identifier", "library"};
     std::size_t row = 0;
     for (const auto& [key, value] : info.items()) {
         table.add({labels[row++], value.get<std::string>()});
@@ -84,8 +83,8 @@ ExitCode runTags(const Options& options) {
         document[info->name] = {{"tag", tagText(info->tag)},
                                 {"type", typeName(info->type)},
                                 {"settable", info->settable}};
-        table.add({info->settable ? "*" : " ", info->name, tagText(info->tag),
-                   typeName(info->type)});
+        table.add(
+            {info->settable ? "*" : " ", info->name, tagText(info->tag), typeName(info->type)});
     }
     if (options.json) {
         Output(true).printJson(document);

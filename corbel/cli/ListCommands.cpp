@@ -13,8 +13,8 @@ namespace {
 // What items shows of each clock: its description, as discovery and one GET of
 // CLOCK_DESCRIPTION give it, and its domain.
 const std::vector<kxSysAttributeTagID> kItemTags = {
-    kxSysNetworkAddress,    kxSysHardwareAddress, kxQvDomainNumber,   kxQvProductDescription,
-    kxQvUserDescription,    kxQvProfileIdentity,  kxSysOwnManufacturer};
+    kxSysNetworkAddress, kxSysHardwareAddress, kxQvDomainNumber,    kxQvProductDescription,
+    kxQvUserDescription, kxQvProfileIdentity,  kxSysOwnManufacturer};
 
 std::string domainText(const ClockPort& port) {
     return port.domain ? std::to_string(*port.domain) : "-";

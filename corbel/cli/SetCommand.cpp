@@ -93,9 +93,9 @@ ExitCode reportOutcome(const CommandContext& context, const std::string& item,
                        const ChangeOutcome& outcome, const FailureCause& cause) {
     std::string what = item + ": ";
     if (outcome.failed) {
-        what += (cause.kind == kxQvFailureKind::refusedByClock ? "the clock refused "
-                                                               : "cannot set ") +
-                tagName(*outcome.failed);
+        what +=
+            (cause.kind == kxQvFailureKind::refusedByClock ? "the clock refused " : "cannot set ") +
+            tagName(*outcome.failed);
     } else {
         what += "the changes failed";
     }
@@ -131,8 +131,8 @@ ExitCode validateAndApply(const CommandContext& context, const std::string& item
     }
     ULONG ignored = 0;
     const HRESULT applied = context.expert().ApplyChanges(name.c_str(), &bag, &ignored);
-    const FailureCause cause = FAILED(applied) ? FailureCause::last(context.expert(), applied)
-                                               : FailureCause{};
+    const FailureCause cause =
+        FAILED(applied) ? FailureCause::last(context.expert(), applied) : FailureCause{};
     std::vector<kxSysAttributeTagID> tags;
     for (const Change& change : changes) {
         tags.push_back(change.info->tag);

@@ -1,5 +1,4 @@
 #include <cstdio>
-#include <set>
 
 #include "corbel/ItemName.h"
 #include "corbel/TagCatalog.h"
@@ -16,18 +15,11 @@ namespace corbel {
 
 namespace {
 
-// One row per tag in tag order; a tag the clock did not give says why.
+// One row per tag, by dataset; a tag the clock did not give says why.
 void printItem(const ItemReading& reading) {
-    std::set<kxSysAttributeTagID> tags;
-    for (const auto& [tag, value] : reading.values) {
-        tags.insert(tag);
-    }
-    for (const auto& [tag, cause] : reading.unread) {
-        tags.insert(tag);
-    }
     Table table;
     table.add({" ", "NAME", "VALUE"});
-    for (const kxSysAttributeTagID tag : tags) {
+    for (const kxSysAttributeTagID tag : reading.tagsInOrder()) {
         const TagInfo* info = findTag(tag);
         const auto value = reading.values.find(tag);
         table.add({info != nullptr && info->settable ? "*" : " ", tagName(tag),

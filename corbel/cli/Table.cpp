@@ -32,6 +32,7 @@ std::string Table::render(const std::string& indent) const {
                 line += std::string(widths[column] - widthOf(row[column]) + 2, ' ');
             }
         }
+        line.erase(line.find_last_not_of(' ') + 1);  // an empty last cell
         text += line + "\n";
     }
     return text;

@@ -29,7 +29,9 @@ constexpr std::chrono::seconds kShortestDiscoveryPeriod{10};
 class Watch {
   public:
     Watch(const CommandContext& context, const Options& options)
-        : context_(context), options_(options), live_(Terminal::isStandardOutput() && !options.json) {}
+        : context_(context),
+          options_(options),
+          live_(Terminal::isStandardOutput() && !options.json) {}
 
     // The clocks to watch: the named ones, or every one discovered.
     ExitCode start(const std::vector<std::string>& items);
@@ -67,8 +69,8 @@ ExitCode Watch::start(const std::vector<std::string>& items) {
         const auto found = reading.values.find(kxQvDomainNumber);
         const auto* domain =
             found == reading.values.end() ? nullptr : std::get_if<std::uint32_t>(&found->second);
-        clocks_.push_back({{item, domain ? std::optional(*domain) : std::nullopt},
-                           std::nullopt, {}, false});
+        clocks_.push_back(
+            {{item, domain ? std::optional(*domain) : std::nullopt}, std::nullopt, {}, false});
     }
     return ExitCode::kSuccess;
 }
@@ -82,9 +84,8 @@ void Watch::rediscover() {
     }
     ExitCode ignored = ExitCode::kSuccess;
     for (ClockPort& port : context_.discover("watch", ignored)) {
-        if (std::ranges::none_of(clocks_, [&](const WatchedClock& clock) {
-                return clock.port.item == port.item;
-            })) {
+        if (std::ranges::none_of(
+                clocks_, [&](const WatchedClock& clock) { return clock.port.item == port.item; })) {
             clocks_.push_back({std::move(port), std::nullopt, {}, false});
         }
     }
@@ -166,8 +167,8 @@ ExitCode runWatch(const Options& options, const std::vector<std::string>& items)
     for (const std::string& item : items) {
         if (!isItemName(item)) {
             Output(options.json)
-                .error("usage", "'" + item + "' is not an item name (such as " +
-                                    kItemNameExample + "; corbel list shows them)");
+                .error("usage", "'" + item + "' is not an item name (such as " + kItemNameExample +
+                                    "; corbel list shows them)");
             return ExitCode::kBadUsage;
         }
     }

@@ -48,8 +48,7 @@ std::string joined(const std::vector<std::string>& words) {
 
 // key=value, the value quoted when it holds a space.
 std::string pair(const std::string& key, const std::string& value) {
-    return " " + key + "=" +
-           (value.find(' ') == std::string::npos ? value : "\"" + value + "\"");
+    return " " + key + "=" + (value.find(' ') == std::string::npos ? value : "\"" + value + "\"");
 }
 
 std::string domainText(const ClockPort& port) {
@@ -105,8 +104,8 @@ std::vector<std::string> WatchView::changesBetween(const ItemReading* before,
 
 std::string WatchView::screen(const std::vector<WatchedClock>& clocks, const std::string& heading) {
     Table table;
-    table.add({"ITEM", "DOMAIN", "PORT STATE", "OFFSET", "MEAN PATH DELAY", "GRANDMASTER",
-               "CHANGES"});
+    table.add(
+        {"ITEM", "DOMAIN", "PORT STATE", "OFFSET", "MEAN PATH DELAY", "GRANDMASTER", "CHANGES"});
     for (const WatchedClock& clock : clocks) {
         if (!clock.last) {
             continue;

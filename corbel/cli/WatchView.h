@@ -16,7 +16,7 @@ struct WatchedClock {
     ClockPort port;
     std::optional<ItemReading> last;   // none before the first sample
     std::vector<std::string> changes;  // since the sample before
-    bool silent = false;  // did not answer: not asked again until the next rediscovery
+    bool silent = false;               // did not answer: not asked again until the next rediscovery
 
     // Takes a new sample: the changes are computed against the previous one.
     void update(ItemReading reading);
