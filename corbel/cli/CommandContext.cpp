@@ -98,11 +98,16 @@ ExitCode CommandContext::report(const std::string& what, const FailureCause& cau
 }
 
 ExitCode CommandContext::reportReading(const ItemReading& reading, bool tagsNamed) const {
+    if (reading.lookupFailure && reading.lookupFailure->result == CORBEL_E_ITEM_NOT_FOUND) {
+        output_.error("not-found",
+                      "no clock answers to the item name " + reading.item +
+                          " (corbel list shows the clocks that answer)",
+                      {{"item", reading.item}});
+        return ExitCode::kNothingFound;
+    }
     if (reading.lookupFailure) {
-        const bool unknown = reading.lookupFailure->result == CORBEL_E_ITEM_NOT_FOUND;
-        return report(unknown ? "no clock answers to the item name " + reading.item
-                              : reading.item + ": cannot look it up",
-                      *reading.lookupFailure, {{"item", reading.item}});
+        return report(reading.item + ": cannot look it up", *reading.lookupFailure,
+                      {{"item", reading.item}});
     }
     const ExitCode outcome = reading.outcome(tagsNamed);
     if (outcome == ExitCode::kSuccess) {
