@@ -3,13 +3,17 @@
 #include <algorithm>
 
 #include "corbel/Discovery.h"
-#include "corbel/MulticastInterfaces.h"
 #include "corbel/ProcessEnvironment.h"
 #include "corbel/TagCatalog.h"
+#include "platform/DiscoveryInterfaces.h"
+#include "platform/MulticastInterfaces.h"
 
 namespace corbel {
 
 namespace {
+
+using qv::dsc::osdep::DiscoveryInterfaces;
+using qv::dsc::osdep::MulticastInterfaces;
 
 std::string joined(const std::vector<std::string>& words, const char* separator) {
     std::string text;
@@ -17,6 +21,15 @@ std::string joined(const std::vector<std::string>& words, const char* separator)
         text += (text.empty() ? "" : separator) + word;
     }
     return text;
+}
+
+// The names of the interfaces that discovery may use.
+std::vector<std::string> usableInterfaces() {
+    std::vector<std::string> names;
+    for (const auto& usable : MulticastInterfaces::list()) {
+        names.push_back(usable.name);
+    }
+    return names;
 }
 
 }  // namespace
@@ -39,24 +52,28 @@ const char* CommandContext::errorKind(ExitCode code) {
     }
 }
 
+// The expert takes the same setting and refuses a name that it does not find; checked here
+// first, so that a typing error is bad usage that lists the names there are.
 bool CommandContext::chooseInterfaces(ExitCode& failed) const {
     const std::vector<std::string>& chosen = options_.interfaces;
     if (chosen.empty()) {
         return true;
     }
-    const bool all = std::ranges::find(chosen, "all") != chosen.end();
-    const auto usable = MulticastInterfaces::names();
-    for (const std::string& name : chosen) {
-        if (name != "all" && std::ranges::find(usable, name) == usable.end()) {
-            output_.error("usage", "--interface " + name +
-                                       ": no such interface that is up with IPv4 and multicast "
-                                       "(there are: " +
-                                       (usable.empty() ? "none" : joined(usable, ", ")) + ")");
-            failed = ExitCode::kBadUsage;
-            return false;
-        }
+    const std::string setting = std::ranges::find(chosen, DiscoveryInterfaces::kAll) != chosen.end()
+                                    ? std::string(DiscoveryInterfaces::kAll)
+                                    : joined(chosen, ",");
+    std::string unknown;
+    if (setting != DiscoveryInterfaces::kAll &&
+        DiscoveryInterfaces::choose(setting, MulticastInterfaces::list(), unknown).empty()) {
+        const auto usable = usableInterfaces();
+        output_.error("usage", "--interface " + unknown +
+                                   ": no such interface that is up with IPv4 and multicast "
+                                   "(there are: " +
+                                   (usable.empty() ? "none" : joined(usable, ", ")) + ")");
+        failed = ExitCode::kBadUsage;
+        return false;
     }
-    ProcessEnvironment::set("QV_INTERFACES", all ? std::string("all") : joined(chosen, ","));
+    ProcessEnvironment::set(DiscoveryInterfaces::kVariable, setting);
     return true;
 }
 
@@ -134,7 +151,7 @@ ExitCode CommandContext::reportNothingFound(const FailureCause& cause) const {
         return report("discovery failed", cause);
     }
     std::string message = "no PTP clock answered in domains 0 to 3";
-    const auto interfaces = MulticastInterfaces::names();
+    const auto interfaces = usableInterfaces();
     if (options_.interfaces.empty() && interfaces.size() > 1) {
         message += "; this machine has " + std::to_string(interfaces.size()) +
                    " multicast interfaces (" + joined(interfaces, ", ") +

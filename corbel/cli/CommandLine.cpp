@@ -99,8 +99,9 @@ class Parser {
             ->type_name("MS")
             ->check(numberCheck("milliseconds", 0, 65535, true));
         app->add_option("--interface", options_.interfaces,
-                        "the network interface to use, repeatable; \"all\" for every one "
-                        "(default: the expert's choice)")
+                        "the network interface to use (a name, or its index), repeatable; "
+                        "\"all\" for every one (default: the stored setting, else the "
+                        "system's default)")
             ->type_name("NAME")
             ->allow_extra_args(false);
         verbose(app);

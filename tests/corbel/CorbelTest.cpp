@@ -138,3 +138,21 @@ TEST_F(Corbel, EndsWithTheDocumentedCodeAndSaysWhyOnStandardError) {
 }
 
 }  // namespace
+
+namespace {
+
+// No clock behind two bridges: the message names both and the option that chooses.
+TEST(CorbelOnTwoNetworks, NamesTheInterfacesWhenNoClockAnswers) {
+    QV_REQUIRE_TEST_NETWORK("ptp4l");
+    const TestNetwork network({"none", "none:net=1"});
+    ASSERT_TRUE(network.isUp()) << network.failure();
+    const auto result =
+        network.runInClient(std::string(QV_CORBEL_PROGRAM) + " --wait 300 list 2>&1");
+    EXPECT_EQ(result.exitStatus, 1);
+    EXPECT_NE(result.output.find("this machine has 2 multicast interfaces (br0, br1): choose "
+                                 "with --interface NAME, or --interface all"),
+              std::string::npos)
+        << result.output;
+}
+
+}  // namespace
