@@ -42,9 +42,6 @@ class CommandContext {
     // why and `failed` is the exit code.
     bool open(bool network, ExitCode& failed);
 
-    // Tells a user at a terminal that a discovery is coming and how long it waits.
-    void announce(const std::string& purpose) const { wait_.announce(purpose.c_str()); }
-
     // Discovers the clock ports and reads each one's domain, keeping those of --domain.
     // With none, it has reported why and `failed` is the exit code; a clock that does not
     // tell its domain is reported and makes `failed` kFailed, and is kept without --domain.
@@ -63,6 +60,9 @@ class CommandContext {
     static const char* errorKind(ExitCode code);
 
   private:
+    // Tells a user at a terminal that a discovery is coming and how long it waits. A named
+    // item needs none: the expert asks for it by name.
+    void announce(const std::string& purpose) const { wait_.announce(purpose.c_str()); }
     bool chooseInterfaces(ExitCode& failed) const;
     ExitCode reportNothingFound(const FailureCause& cause) const;
 

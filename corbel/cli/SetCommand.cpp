@@ -176,7 +176,6 @@ ExitCode runSet(const Options& options, const std::vector<std::string>& argument
     if (!context.open(true, failed)) {
         return failed;
     }
-    context.announce("set " + item);
     ComPtr<IkxSysPropertyBag> base;
     const HRESULT found = context.expert().GetItem(toUtf16(item).c_str(), base.out());
     if (FAILED(found) || !base) {

@@ -57,7 +57,6 @@ ExitCode runShow(const Options& options, const std::vector<std::string>& argumen
     if (!context.open(true, code)) {
         return code;
     }
-    context.announce("show");  // the first GetItem discovers
     nlohmann::ordered_json document = nlohmann::ordered_json::object();
     for (const std::string& item : items) {
         const ItemReading reading = context.reader().read(item, wanted, options.all);

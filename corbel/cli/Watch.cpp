@@ -32,7 +32,6 @@ ExitCode Watch::start(const std::vector<std::string>& items) {
         }
         return clocks_.empty() ? code : ExitCode::kSuccess;
     }
-    context_.announce("watch");
     for (const std::string& item : items) {
         const ItemReading reading = context_.reader().read(item, {kxQvDomainNumber});
         if (reading.lookupFailure) {
