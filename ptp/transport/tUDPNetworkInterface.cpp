@@ -99,7 +99,9 @@ void tUDPNetworkInterface::openSendSockets(tStatus& status) {
         in_addr outgoing{};
         outgoing.s_addr = interface.address;
         if (!setOption(fd, IPPROTO_IP, IP_MULTICAST_IF, outgoing)) {
-            QV_STATUS_SET(status, kStatusSocketError, kComponentCodec);
+            if (QV_STATUS_SET(status, kStatusSocketError, kComponentCodec)) {
+                tStatusReason::systemCall(status, "setsockopt IP_MULTICAST_IF", errno);
+            }
             return;
         }
     }
@@ -124,18 +126,30 @@ int tUDPNetworkInterface::openReceiveSocket(std::uint16_t port, tStatus& status)
     if (!setOption(fd, SOL_SOCKET, SO_RCVBUFFORCE, kReceiveBufferOctets)) {
         setOption(fd, SOL_SOCKET, SO_RCVBUF, kReceiveBufferOctets);
     }
-    // IP_PKTINFO: each datagram tells on which interface it came in.
-    bool configured = setOption(fd, SOL_SOCKET, SO_REUSEADDR, 1) &&
-                      setOption(fd, IPPROTO_IP, IP_PKTINFO, 1) &&
-                      bind(fd, reinterpret_cast<const sockaddr*>(&local), sizeof(local)) == 0;
+    // IP_PKTINFO: each datagram tells on which interface it came in. The first step that
+    // fails is named, with the system's reason, so that a user learns what kept the ports shut.
+    const char* failed = nullptr;
+    int error = 0;
+    const auto fails = [&](const char* step, bool ok) {
+        if (failed == nullptr && !ok) {
+            failed = step;
+            error = errno;
+        }
+        return failed == nullptr;
+    };
+    fails("setsockopt SO_REUSEADDR", setOption(fd, SOL_SOCKET, SO_REUSEADDR, 1)) &&
+        fails("setsockopt IP_PKTINFO", setOption(fd, IPPROTO_IP, IP_PKTINFO, 1)) &&
+        fails(port == kEventPort ? "bind to UDP port 319" : "bind to UDP port 320",
+              !(bind(fd, reinterpret_cast<const sockaddr*>(&local), sizeof(local)) != 0));
     for (const auto& interface : interfacesToOpen()) {
         ip_mreq membership{};
         membership.imr_multiaddr.s_addr = groupAddress_;
         membership.imr_interface.s_addr = interface.address;
-        configured = configured && setOption(fd, IPPROTO_IP, IP_ADD_MEMBERSHIP, membership);
+        fails("joining the group 224.0.1.129",
+              failed != nullptr || setOption(fd, IPPROTO_IP, IP_ADD_MEMBERSHIP, membership));
     }
-    if (!configured) {
-        QV_STATUS_SET(status, kStatusSocketError, kComponentCodec);
+    if (failed != nullptr && QV_STATUS_SET(status, kStatusSocketError, kComponentCodec)) {
+        tStatusReason::systemCall(status, failed, error);
     }
     return fd;  // kept, like every socket of a failed open, until close
 }
@@ -152,13 +166,14 @@ void tUDPNetworkInterface::closeSockets() {
     closeIfValid(generalSocket_);
 }
 
-bool tUDPNetworkInterface::sendDatagram(int fd, std::uint16_t port, const tProtocolDataUnit& unit) {
+int tUDPNetworkInterface::sendDatagram(int fd, std::uint16_t port, const tProtocolDataUnit& unit) {
     sockaddr_in target{};
     target.sin_family = AF_INET;
     target.sin_addr.s_addr = groupAddress_;
     target.sin_port = htons(port);
-    return sendto(fd, unit.getBuffer(), unit.getLength(), 0,
-                  reinterpret_cast<const sockaddr*>(&target), sizeof(target)) >= 0;
+    const bool sent = sendto(fd, unit.getBuffer(), unit.getLength(), 0,
+                             reinterpret_cast<const sockaddr*>(&target), sizeof(target)) >= 0;
+    return sent ? 0 : errno;
 }
 
 void tUDPNetworkInterface::receive(tProtocolDataUnit& unit, tStatus& status) {

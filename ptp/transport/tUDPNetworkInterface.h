@@ -92,7 +92,8 @@ class tUDPNetworkInterface final : public iPTPPortMessaging {
     int openReceiveSocket(std::uint16_t port, tStatus& status);
     void sendTo(std::uint16_t port, const tProtocolDataUnit& unit, tInterfaceIndex via,
                 tStatus& status);
-    bool sendDatagram(int fd, std::uint16_t port, const tProtocolDataUnit& unit);
+    // 0 when sent, else the system's error number.
+    int sendDatagram(int fd, std::uint16_t port, const tProtocolDataUnit& unit);
     bool awaitDatagram(int& readySocket, tStatus& status);
     bool reportAbort(tStatus& status);
     void noteCompatibility(std::uint8_t firstOctet, bool eventPort);

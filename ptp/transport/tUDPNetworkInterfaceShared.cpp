@@ -3,6 +3,8 @@
 #include <algorithm>
 #include <cstring>
 
+#include "platform/tStatusReason.h"
+
 // The parts of the UDP interface that are the same on every system: padding of event
 // messages for compatible peers, the choice of send sockets, the abort flag, and closing
 // once no receive runs. The sockets themselves are in tUDPNetworkInterface.cpp (POSIX) and
@@ -59,13 +61,16 @@ void tUDPNetworkInterface::sendTo(std::uint16_t port, const tProtocolDataUnit& u
         return via != kEveryInterface && socket.index == via;
     });
     bool sent = false;
+    int error = 0;
     for (const tSendSocket& socket : sendSockets_) {
         if (!one || socket.index == via) {
-            sent = sendDatagram(socket.fd, port, unit) || sent;
+            const int failed = sendDatagram(socket.fd, port, unit);
+            sent = sent || failed == 0;
+            error = failed != 0 ? failed : error;
         }
     }
-    if (!sent) {
-        QV_STATUS_SET(status, kStatusSocketError, kComponentCodec);
+    if (!sent && QV_STATUS_SET(status, kStatusSocketError, kComponentCodec)) {
+        tStatusReason::systemCall(status, "sendto 224.0.1.129", error);
     }
 }
 

@@ -169,7 +169,9 @@ void tUDPNetworkInterface::openSendSockets(tStatus& status) {
         in_addr outgoing{};
         outgoing.s_addr = interface.address;
         if (!setOption(fd, IPPROTO_IP, IP_MULTICAST_IF, outgoing)) {
-            QV_STATUS_SET(status, kStatusSocketError, kComponentCodec);
+            if (QV_STATUS_SET(status, kStatusSocketError, kComponentCodec)) {
+                tStatusReason::systemCall(status, "setsockopt IP_MULTICAST_IF", WSAGetLastError());
+            }
             return;
         }
     }
@@ -191,19 +193,30 @@ int tUDPNetworkInterface::openReceiveSocket(std::uint16_t port, tStatus& status)
     local.sin_addr.s_addr = localInterfaceAddress_;
     // The larger buffer is a wish, not a need: a smaller one still works.
     setOption(fd, SOL_SOCKET, SO_RCVBUF, kReceiveBufferOctets);
-    // IP_PKTINFO: each datagram tells on which interface it came in.
-    bool configured =
-        setOption(fd, SOL_SOCKET, SO_REUSEADDR, BOOL{TRUE}) &&
-        setOption(fd, IPPROTO_IP, IP_PKTINFO, DWORD{1}) &&
-        bind(handleOf(fd), reinterpret_cast<const sockaddr*>(&local), sizeof(local)) == 0;
+    // IP_PKTINFO: each datagram tells on which interface it came in. The first step that
+    // fails is named, with the system's reason, so that a user learns what kept the ports shut.
+    const char* failed = nullptr;
+    int error = 0;
+    const auto fails = [&](const char* step, bool ok) {
+        if (failed == nullptr && !ok) {
+            failed = step;
+            error = WSAGetLastError();
+        }
+        return failed == nullptr;
+    };
+    fails("setsockopt SO_REUSEADDR", setOption(fd, SOL_SOCKET, SO_REUSEADDR, BOOL{TRUE})) &&
+        fails("setsockopt IP_PKTINFO", setOption(fd, IPPROTO_IP, IP_PKTINFO, DWORD{1})) &&
+        fails(port == kEventPort ? "bind to UDP port 319" : "bind to UDP port 320",
+              !(bind(handleOf(fd), reinterpret_cast<const sockaddr*>(&local), sizeof(local)) != 0));
     for (const auto& interface : interfacesToOpen()) {
         ip_mreq membership{};
         membership.imr_multiaddr.s_addr = groupAddress_;
         membership.imr_interface.s_addr = interface.address;
-        configured = configured && setOption(fd, IPPROTO_IP, IP_ADD_MEMBERSHIP, membership);
+        fails("joining the group 224.0.1.129",
+              failed != nullptr || setOption(fd, IPPROTO_IP, IP_ADD_MEMBERSHIP, membership));
     }
-    if (!configured) {
-        QV_STATUS_SET(status, kStatusSocketError, kComponentCodec);
+    if (failed != nullptr && QV_STATUS_SET(status, kStatusSocketError, kComponentCodec)) {
+        tStatusReason::systemCall(status, failed, error);
     }
     return fd;  // kept, like every socket of a failed open, until close
 }
@@ -220,14 +233,16 @@ void tUDPNetworkInterface::closeSockets() {
     closeIfValid(generalSocket_);
 }
 
-bool tUDPNetworkInterface::sendDatagram(int fd, std::uint16_t port, const tProtocolDataUnit& unit) {
+int tUDPNetworkInterface::sendDatagram(int fd, std::uint16_t port, const tProtocolDataUnit& unit) {
     sockaddr_in target{};
     target.sin_family = AF_INET;
     target.sin_addr.s_addr = groupAddress_;
     target.sin_port = htons(port);
-    return sendto(handleOf(fd), reinterpret_cast<const char*>(unit.getBuffer()),
-                  static_cast<int>(unit.getLength()), 0, reinterpret_cast<const sockaddr*>(&target),
-                  sizeof(target)) != SOCKET_ERROR;
+    const bool sent =
+        sendto(handleOf(fd), reinterpret_cast<const char*>(unit.getBuffer()),
+               static_cast<int>(unit.getLength()), 0, reinterpret_cast<const sockaddr*>(&target),
+               sizeof(target)) != SOCKET_ERROR;
+    return sent ? 0 : WSAGetLastError();
 }
 
 void tUDPNetworkInterface::receive(tProtocolDataUnit& unit, tStatus& status) {
