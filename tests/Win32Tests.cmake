@@ -24,3 +24,10 @@ target_compile_definitions(qv_ptp_tests PRIVATE QV_TEST_DATA_DIR="${CMAKE_CURREN
 file(GLOB QV_PTPMGMT_TESTS CONFIGURE_DEPENDS ${CMAKE_CURRENT_SOURCE_DIR}/ptpmgmt/*.cpp)
 qv_add_unit_tests(qv_ptpmgmt_tests SOURCES ${QV_PTPMGMT_TESTS}
                   LIBS qv_ptpmgmt qv_test_support_ptpmgmt)
+
+# corbel's host pieces: words, units, times, JSON and exit codes (the command-line answers
+# are checked by running the POSIX program).
+if(TARGET corbel_host)
+  qv_add_unit_tests(qv_corbel_tests SOURCES corbel/ValueTextTest.cpp corbel/UtcTimeTest.cpp
+                    corbel/OutcomeTest.cpp LIBS corbel_host)
+endif()

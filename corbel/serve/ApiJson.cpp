@@ -1,7 +1,7 @@
 #include "corbel/serve/ApiJson.h"
 
 #include "corbel/TagCatalog.h"
-#include "corbel/serve/ValueObjects.h"
+#include "corbel/ValueJson.h"
 
 namespace corbel {
 
@@ -18,9 +18,9 @@ void addValue(nlohmann::ordered_json& values, const ClockStatus& clock, kxSysAtt
     const TagInfo* info = findTag(tag);
     const std::string name = info != nullptr ? info->name : tagText(tag);
     if (const auto value = clock.values.find(tag); value != clock.values.end()) {
-        values[name] = valueObject(tag, value->second);
+        values[name] = entryJson(tag, value->second);
     } else if (const auto unread = clock.unread.find(tag); unread != clock.unread.end()) {
-        values[name] = unreadObject(tag, unread->second);
+        values[name] = unreadJson(tag, unread->second);
     }
 }
 

@@ -7,34 +7,24 @@
 #include <string>
 #include <vector>
 
+#include "corbel/FailureCause.h"
 #include "corbel/PropertyValue.h"
 #include "corbel/TagCatalog.h"
 
 namespace corbel {
 
-// Why an exchange with a clock failed, as the expert recorded it for the calling thread.
-struct ReadFailure {
-    kxQvFailureKind kind = kxQvFailureKind::other;
-    ULONG managementErrorId = 0;  // the clock's reason when it refused
-    std::string words;            // the expert's description
-
-    // The clock said it has no such data: a normal answer of a clock that implements
-    // less than all of IEEE 1588 (ptp4l and TIME), not a fault.
-    bool notSupported() const;
-};
-
 // One read of a clock port: the values it gave and, for each tag it did not give, why.
 struct ClockReading {
     PropertyValues values;
-    std::map<kxSysAttributeTagID, ReadFailure> unread;
-    std::vector<ReadFailure> failedExchanges;    // one per request that failed
+    std::map<kxSysAttributeTagID, FailureCause> unread;
+    std::vector<FailureCause> failedExchanges;   // one per request that failed
     std::vector<std::size_t> unsupportedGroups;  // ReadGroups indexes the clock refused for good
     bool answered = false;                       // the clock answered at least one request
 };
 
 struct DiscoveryOutcome {
     std::vector<std::string> items;  // every port known, in item-name order
-    std::vector<ReadFailure> failedExchanges;
+    std::vector<FailureCause> failedExchanges;
 };
 
 // One value to write, of the tag's own type.
@@ -51,7 +41,7 @@ struct WriteOutcome {
     std::map<std::string, std::string> sentences;  // by setting name, when rejected
     std::vector<std::string> written, notSent;     // setting names
     std::string refusedTag, reason;
-    std::vector<ReadFailure> failedExchanges;
+    std::vector<FailureCause> failedExchanges;
 };
 
 // What the poller needs of the expert. The poller's thread is the only caller.

@@ -1,28 +1,17 @@
 #include "corbel/serve/ExpertClockSource.h"
 
 #include <algorithm>
+#include <set>
 
+#include "corbel/ChangeOutcome.h"
+#include "corbel/Discovery.h"
+#include "corbel/ItemReader.h"
 #include "corbel/ReadGroups.h"
 #include "corbel/WideText.h"
-#include "corbel/serve/ValueObjects.h"
 
 namespace corbel {
 
 namespace {
-
-std::vector<std::string> namesOf(IkxSysEnumStringList& names) {
-    std::vector<std::string> result;
-    BSTR batch[16] = {};
-    ULONG fetched = 0;
-    while (SUCCEEDED(names.Next(16, batch, &fetched)) && fetched > 0) {
-        for (ULONG i = 0; i < fetched; ++i) {
-            result.push_back(toUtf8(batch[i] == nullptr ? u"" : batch[i]));
-            SysFreeString(batch[i]);
-        }
-        fetched = 0;
-    }
-    return result;
-}
 
 // The expert's sentences end with two spaces each.
 std::string trimmed(std::string sentence) {
@@ -30,113 +19,108 @@ std::string trimmed(std::string sentence) {
     return sentence;
 }
 
-bool store(IkxSysPropertyBag2& bag, const std::vector<Setting>& settings) {
-    return std::ranges::all_of(settings, [&bag](const Setting& setting) {
-        return SUCCEEDED(storeValue(bag, setting.tag->tag, setting.value));
-    });
+std::vector<std::string> namesOf(const std::vector<kxSysAttributeTagID>& tags) {
+    std::vector<std::string> names;
+    for (const kxSysAttributeTagID tag : tags) {
+        names.push_back(tagName(tag));
+    }
+    return names;
+}
+
+// Every tag but those of the skipped groups, and but the base ones unless `withBase`.
+std::vector<kxSysAttributeTagID> tagsToRead(const std::vector<std::size_t>& skipGroups,
+                                            bool withBase) {
+    std::set<kxSysAttributeTagID> skipped;
+    for (const std::size_t group : skipGroups) {
+        skipped.insert(readGroups()[group].tags.begin(), readGroups()[group].tags.end());
+    }
+    std::vector<kxSysAttributeTagID> tags;
+    for (const TagInfo& info : allTags()) {
+        if (!skipped.contains(info.tag) && (withBase || !isBaseTag(info))) {
+            tags.push_back(info.tag);
+        }
+    }
+    return tags;
 }
 
 }  // namespace
 
-ReadFailure ExpertClockSource::lastFailure(kxSysAttributeTagID* tag) const {
-    ReadFailure failure;
-    const auto failures = queryInterface<IkxQvLastFailure2>(expert_, IID_IkxQvLastFailure2);
-    if (!failures) {
-        return failure;
-    }
-    ULONG kind = 0;
-    OwnedBstr description;
-    failures->GetLastFailureCause(&kind, &failure.managementErrorId, tag);
-    failures->GetLastFailure(description.out(), nullptr);
-    failure.kind = kind == 0 ? kxQvFailureKind::other : static_cast<kxQvFailureKind>(kind);
-    failure.words = description.utf8();
-    return failure;
-}
-
 DiscoveryOutcome ExpertClockSource::discover() {
-    DiscoveryOutcome outcome;
-    ComPtr<IkxSysEnumStringList> names;
-    const HRESULT result = expert_.GetItemNames(names.out());
-    if (result == S_OK && names) {
-        outcome.items = namesOf(*names);
-        std::ranges::sort(outcome.items);
-    } else if (const ReadFailure failure = lastFailure(); !failure.words.empty()) {
-        outcome.failedExchanges.push_back(failure);  // not a mere "nobody answered"
+    Discovery discovery = Discovery::run(expert_);
+    std::ranges::sort(discovery.items);
+    DiscoveryOutcome outcome{std::move(discovery.items), {}};
+    if (discovery.failed()) {
+        outcome.failedExchanges.push_back(discovery.failure);
     }
     return outcome;
 }
 
+// What the reading tells of each group: read, refused for good, or why not.
 ClockReading ExpertClockSource::read(const std::string& item,
                                      const std::vector<std::size_t>& skipGroups, bool withBase) {
-    ClockReading reading;
-    const std::u16string name = toUtf16(item);
-    if (withBase) {
-        ComPtr<IkxSysPropertyBag> base;
-        if (SUCCEEDED(expert_.GetItem(name.c_str(), base.out())) && base) {
-            reading.values = readBag(*base);
-        }
+    ItemReading reading = ItemReader(expert_).read(item, tagsToRead(skipGroups, withBase));
+    ClockReading result{std::move(reading.values), std::move(reading.unread), {}, {}, false};
+    if (reading.lookupFailure) {
+        result.failedExchanges.push_back(*reading.lookupFailure);
+        return result;
     }
     const auto& groups = readGroups();
+    bool silent = false;  // a clock that stops answering is asked no further in a reading
     for (std::size_t index = 0; index < groups.size(); ++index) {
         const auto& tags = groups[index].tags;
-        if (tags.empty() || std::ranges::find(skipGroups, index) != skipGroups.end()) {
+        const auto unread = tags.empty() ? result.unread.end() : result.unread.find(tags.front());
+        if (unread == result.unread.end()) {
+            result.answered =
+                result.answered || (!tags.empty() && result.values.contains(tags.front()));
             continue;
         }
-        ComPtr<IkxSysPropertyBag> bag;
-        const HRESULT result = expert_.GetItemProperties(
-            name.c_str(), static_cast<ULONG>(tags.size()), tags.data(), nullptr, bag.out());
-        if (FAILED(result)) {
-            const ReadFailure failure = lastFailure();
-            reading.failedExchanges.push_back(failure);
-            for (const kxSysAttributeTagID tag : tags) {
-                reading.unread[tag] = failure;
-            }
-            if (failure.notSupported()) {
-                reading.unsupportedGroups.push_back(index);
-            }
-            // A clock that does not answer would make every further request wait the
-            // expert's whole time-out.
-            if (failure.kind != kxQvFailureKind::refusedByClock) {
-                break;
-            }
+        const FailureCause& cause = unread->second;
+        result.answered = result.answered || cause.kind == kxQvFailureKind::refusedByClock;
+        if (cause.notSupported()) {
+            result.unsupportedGroups.push_back(index);
         }
-        reading.answered = reading.answered || SUCCEEDED(result) ||
-                           reading.failedExchanges.back().kind == kxQvFailureKind::refusedByClock;
-        if (bag) {
-            for (auto& [tag, value] : readBag(*bag)) {
-                reading.values.insert_or_assign(tag, std::move(value));
-            }
+        if (!silent) {
+            result.failedExchanges.push_back(cause);
         }
+        silent = silent || cause.kind == kxQvFailureKind::noAnswer;
     }
-    return reading;
+    return result;
 }
 
 ComPtr<IkxSysPropertyBag2> ExpertClockSource::changeBag(const std::u16string& item,
-                                                        ReadFailure& failure) const {
+                                                        const std::vector<Setting>& settings,
+                                                        FailureCause& failure) const {
     ComPtr<IkxSysPropertyBag> base;
-    if (FAILED(expert_.GetItem(item.c_str(), base.out())) || !base) {
-        failure = lastFailure();
+    const HRESULT found = expert_.GetItem(item.c_str(), base.out());
+    if (FAILED(found) || !base) {
+        failure = FailureCause::last(expert_, FAILED(found) ? found : E_POINTER);
         return {};
     }
     auto bag = base.query<IkxSysPropertyBag2>(IID_IkxSysPropertyBag2);
     if (!bag || FAILED(bag->ClearChangedTags())) {
-        failure.words = "the item's bag takes no changes";
+        failure = FailureCause::of(E_NOINTERFACE);
         return {};
+    }
+    for (const Setting& setting : settings) {
+        if (const HRESULT stored = storeValue(*bag, setting.tag->tag, setting.value);
+            FAILED(stored)) {
+            failure = FailureCause::of(stored);
+            return {};
+        }
     }
     return bag;
 }
 
 WriteOutcome ExpertClockSource::write(const std::string& item,
-                                      const std::vector<Setting>& unordered) {
+                                      const std::vector<Setting>& settings) {
     WriteOutcome outcome;
-    std::vector<Setting> settings = unordered;  // ApplyChanges sends in ascending tag order
-    std::ranges::sort(settings, {}, [](const Setting& setting) { return setting.tag->tag; });
     const std::u16string name = toUtf16(item);
-    ReadFailure failure;
-    const auto bag = changeBag(name, failure);
-    if (!bag || !store(*bag, settings)) {
+    FailureCause failure;
+    const auto bag = changeBag(name, settings, failure);
+    if (!bag) {
         outcome.result = WriteOutcome::Result::refused;
-        outcome.reason = failure.words.empty() ? "the values cannot be stored" : failure.words;
+        outcome.reason = failure.words();
+        outcome.failedExchanges.push_back(failure);
         return outcome;
     }
     ComPtr<IkxSysEnumPropertyTag> accepted;
@@ -156,13 +140,12 @@ void ExpertClockSource::reject(const std::u16string& item, const std::vector<Set
                                WriteOutcome& outcome) const {
     outcome.result = WriteOutcome::Result::rejected;
     for (const Setting& setting : settings) {
-        ReadFailure failure;
-        const auto bag = changeBag(item, failure);
+        FailureCause failure;
+        const auto bag = changeBag(item, {setting}, failure);
         ComPtr<IkxSysEnumPropertyTag> accepted;
         OwnedBstr message;
-        if (bag && store(*bag, {setting}) &&
-            expert_.ValidateChanges(item.c_str(), bag.get(), accepted.out(), message.out()) ==
-                CORBEL_E_INVALID_VALUE) {
+        if (bag && expert_.ValidateChanges(item.c_str(), bag.get(), accepted.out(),
+                                           message.out()) == CORBEL_E_INVALID_VALUE) {
             outcome.sentences[setting.tag->name] = trimmed(message.utf8());
         }
     }
@@ -171,30 +154,24 @@ void ExpertClockSource::reject(const std::u16string& item, const std::vector<Set
 void ExpertClockSource::apply(const std::u16string& item, const std::vector<Setting>& settings,
                               IkxSysPropertyBag2& bag, WriteOutcome& outcome) const {
     ULONG ignored = 0;
-    if (SUCCEEDED(expert_.ApplyChanges(item.c_str(), &bag, &ignored))) {
-        for (const Setting& setting : settings) {
-            outcome.written.push_back(setting.tag->name);
-        }
+    const HRESULT applied = expert_.ApplyChanges(item.c_str(), &bag, &ignored);
+    const FailureCause cause =
+        FAILED(applied) ? FailureCause::last(expert_, applied) : FailureCause::of(applied);
+    std::vector<kxSysAttributeTagID> changed;
+    for (const Setting& setting : settings) {
+        changed.push_back(setting.tag->tag);
+    }
+    const ChangeOutcome change = ChangeOutcome::of(changed, cause);
+    outcome.written = namesOf(change.written);
+    if (SUCCEEDED(applied)) {
         return;
     }
-    kxSysAttributeTagID stopped = 0;
-    const ReadFailure failure = lastFailure(&stopped);
-    outcome.failedExchanges.push_back(failure);
+    outcome.failedExchanges.push_back(cause);
     outcome.result = WriteOutcome::Result::refused;
-    outcome.reason = failureWords(failure);
-    // Without the tag where it stopped, the first one is named: nothing is known written.
-    if (stopped == 0) {
-        stopped = settings.front().tag->tag;
-    }
-    for (const Setting& setting : settings) {
-        if (setting.tag->tag < stopped) {
-            outcome.written.push_back(setting.tag->name);
-        } else if (setting.tag->tag == stopped) {
-            outcome.refusedTag = setting.tag->name;
-        } else {
-            outcome.notSent.push_back(setting.tag->name);
-        }
-    }
+    outcome.reason = cause.words();
+    outcome.refusedTag = change.failed ? tagName(*change.failed) : std::string();
+    // Where the expert does not say where it stopped, none is known written.
+    outcome.notSent = namesOf(change.failed ? change.notSent : change.unknown);
 }
 
 }  // namespace corbel

@@ -8,9 +8,10 @@
 
 namespace corbel {
 
-// The clocks through the loaded expert: a discovery is GetItemNames, a read one
-// GetItemProperties per group of tags (as corbel show reads), a write ValidateChanges then
-// ApplyChanges on the item's own bag. Why a call failed comes from IkxQvLastFailure2.
+// The clocks through the loaded expert, as every corbel face reads them: a discovery is
+// Discovery::run, a read ItemReader's (one GetItemProperties per dataset), a write
+// ValidateChanges then ApplyChanges on the item's own bag; why a call failed is its
+// FailureCause.
 class ExpertClockSource final : public ClockSource {
   public:
     explicit ExpertClockSource(IkxSysExpert2& expert) : expert_(expert) {}
@@ -21,10 +22,11 @@ class ExpertClockSource final : public ClockSource {
     WriteOutcome write(const std::string& item, const std::vector<Setting>& settings) override;
 
   private:
-    // What the expert recorded for this thread's last call; `tag` where ApplyChanges stopped.
-    ReadFailure lastFailure(kxSysAttributeTagID* tag = nullptr) const;
-    // The item's own bag with its changed tags cleared; empty with `failure` set otherwise.
-    ComPtr<IkxSysPropertyBag2> changeBag(const std::u16string& item, ReadFailure& failure) const;
+    // The item's own bag with `settings` as its changed tags; empty with `failure` set when
+    // the item or a value cannot be had.
+    ComPtr<IkxSysPropertyBag2> changeBag(const std::u16string& item,
+                                         const std::vector<Setting>& settings,
+                                         FailureCause& failure) const;
     void reject(const std::u16string& item, const std::vector<Setting>& settings,
                 WriteOutcome& outcome) const;
     void apply(const std::u16string& item, const std::vector<Setting>& settings,

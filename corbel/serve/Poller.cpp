@@ -2,8 +2,8 @@
 
 #include <algorithm>
 
+#include "corbel/ValueWords.h"
 #include "corbel/serve/ApiJson.h"
-#include "corbel/serve/ValueObjects.h"
 
 namespace corbel {
 
@@ -167,7 +167,7 @@ void Poller::merge(Tracked& clock, ClockReading& reading, WallTime now) {
     ClockStatus& status = clock.status;
     status.lastRead = now;
     status.lastReadOk = reading.answered &&
-                        std::ranges::all_of(reading.failedExchanges, &ReadFailure::notSupported);
+                        std::ranges::all_of(reading.failedExchanges, &FailureCause::notSupported);
     if (!reading.answered) {
         status.present = false;
         return;
@@ -198,8 +198,8 @@ void Poller::noteChanges(const ClockStatus& before, const ClockStatus& after, Wa
     const auto stateBefore = valueOf<std::int32_t>(before, kxQvPortState);
     const auto stateAfter = valueOf<std::int32_t>(after, kxQvPortState);
     if (stateBefore && stateAfter && *stateBefore != *stateAfter) {
-        const std::string from = portStateWord(*stateBefore);
-        const std::string to = portStateWord(*stateAfter);
+        const std::string from = wordsOf(kxQvPortState, *stateBefore).word;
+        const std::string to = wordsOf(kxQvPortState, *stateAfter).word;
         addEvent(item, "portState", item + ": port state " + from + " -> " + to,
                  {{"from", from}, {"to", to}}, now);
     }
@@ -251,8 +251,8 @@ void Poller::serve(WriteJob& job) {
     job.done.set_value(std::move(outcome));
 }
 
-void Poller::countFailures(const std::vector<ReadFailure>& failures) {
-    for (const ReadFailure& failure : failures) {
+void Poller::countFailures(const std::vector<FailureCause>& failures) {
+    for (const FailureCause& failure : failures) {
         state_.counters().countFailure(failure.kind);
     }
 }

@@ -67,7 +67,7 @@ class Poller final : public SettingsWriter {
                   nlohmann::ordered_json detail, WallTime now);
     void serveWrites();
     void serve(WriteJob& job);
-    void countFailures(const std::vector<ReadFailure>& failures);
+    void countFailures(const std::vector<FailureCause>& failures);
     void publish();
 
     ClockSource& source_;

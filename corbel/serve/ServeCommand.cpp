@@ -4,8 +4,6 @@
 #include <cstdio>
 #include <thread>
 
-#include "corbel/DiscoveryWait.h"
-#include "corbel/ExpertSession.h"
 #include "corbel/serve/ExpertClockSource.h"
 #include "corbel/serve/HttpServer.h"
 #include "corbel/serve/Poller.h"
@@ -45,7 +43,7 @@ std::string writesText(const ServeOptions& options, const AccessToken& token) {
 
 }  // namespace
 
-ExitCode runServe(const ServeOptions& options) {
+ExitCode runServe(const ServeOptions& options, const ExpertOpener& openExpert) {
     const auto listen = ListenAddress::parse(options.listen);
     if (!listen) {
         return refuse("--listen takes ADDR:PORT, e.g. 127.0.0.1:8588 or [::1]:8588, not '" +
@@ -61,20 +59,18 @@ ExitCode runServe(const ServeOptions& options) {
                       ", which is not loopback, needs a token: --token-file FILE or the "
                       "environment variable CORBEL_SERVE_TOKEN (or --read-only)");
     }
-    const DiscoveryWait wait(options.waitMilliseconds);
-    ExpertSession session(options.expertPath);
-    if (!session.isReady()) {
-        return refuse(session.failure(), ExitCode::kNoExpert);
-    }
-    // Before the expert's receive thread starts.
+    // Before the expert's receive thread starts, which inherits the mask.
     const sigset_t signals = endSignals();
     pthread_sigmask(SIG_BLOCK, &signals, nullptr);
     std::signal(SIGPIPE, SIG_IGN);  // a client gone mid-answer is an error, not an end
-    if (!session.initialize()) {
-        return refuse(session.failure(), ExitCode::kNoExpert);
+    ExitCode failed = ExitCode::kNoExpert;
+    IkxSysExpert2* expert = openExpert(failed);
+    if (expert == nullptr) {
+        pthread_sigmask(SIG_UNBLOCK, &signals, nullptr);
+        return failed;
     }
     ServiceState state;
-    ExpertClockSource source(session.expert());
+    ExpertClockSource source(*expert);
     Poller poller(
         source, state,
         {std::chrono::seconds(options.interval), std::chrono::seconds(options.rediscover)});

@@ -27,8 +27,8 @@ class ServiceState {
   private:
     mutable std::mutex lock_;
     std::shared_ptr<const Snapshot> snapshot_;  // guarded by lock_
-    EventLog events_;           // locks itself
-    ServiceCounters counters_;  // atomic counts
+    EventLog events_;                           // locks itself
+    ServiceCounters counters_;                  // atomic counts
 };
 
 }  // namespace corbel

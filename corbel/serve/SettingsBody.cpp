@@ -44,7 +44,8 @@ std::optional<PropertyValue> valueOf(const nlohmann::json& value, ULONG type) {
             return value.is_string() ? std::optional<PropertyValue>(value.get<std::string>())
                                      : std::nullopt;
         case kxSysPropertyTypeTimestamp: {
-            const auto time = value.is_string() ? parseUtc(value.get<std::string>()) : std::nullopt;
+            const auto time =
+                value.is_string() ? parseUtc(value.get<std::string>()).time : std::nullopt;
             return time ? std::optional<PropertyValue>(*time) : std::nullopt;
         }
         default:

@@ -24,7 +24,7 @@ struct ClockStatus {
     std::optional<WallTime> lastRead;
     bool lastReadOk = false;  // the last read had an answer for every group it asked
     PropertyValues values;    // the base values and every value of the last read
-    std::map<kxSysAttributeTagID, ReadFailure> unread;
+    std::map<kxSysAttributeTagID, FailureCause> unread;
     std::shared_ptr<History> history;  // shared with the poller, which appends to it
 
     std::optional<std::uint32_t> domain() const;

@@ -18,7 +18,10 @@ ClockStatus ptp4l() {
                     {kxQvGrandmasterIdentity, std::string("02-11-22-FF-FE-33-44-55")},
                     {kxQvUserDescription, std::string("alpha \"rack\"")},
                     {kxSysItemName, kPtp4lItem}};
-    clock.unread[kxQvTime] = {kxQvFailureKind::refusedByClock, 6, "refused"};
+    FailureCause notSupported = FailureCause::of(E_FAIL);
+    notSupported.kind = kxQvFailureKind::refusedByClock;
+    notSupported.managementErrorId = 6;  // NOT_SUPPORTED
+    clock.unread[kxQvTime] = notSupported;
     clock.history->append({1796558399000, -10.0, 25.0, 6});
     clock.history->append({1796558400000, std::nullopt, std::nullopt, std::nullopt});
     return clock;

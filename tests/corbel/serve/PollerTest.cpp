@@ -41,7 +41,8 @@ class ScriptedClock final : public ClockSource {
 
 TEST(ServePoller, NotesChangesAsEventsKeepsHistoryAndMarksAClockThatStopsAnswering) {
     ClockReading silence;
-    silence.failedExchanges.push_back({kxQvFailureKind::noAnswer, 0, "no answer"});
+    silence.failedExchanges.push_back(FailureCause::of(E_FAIL));
+    silence.failedExchanges.back().kind = kxQvFailureKind::noAnswer;
     ScriptedClock clock({answer(6, "AA"), answer(9, "BB"), silence});
     ServiceState state;
     Poller poller(clock, state, {std::chrono::seconds(1), std::chrono::seconds(3600)});

@@ -88,7 +88,7 @@ TEST(ServeOnRealClocks, ShowsTheClocksWritesWithTheTokenOnlyAndFeedsPrometheus) 
     EXPECT_EQ(clocks[0]["item"], kPtp4l);
     EXPECT_EQ(clocks[1]["values"]["priority1"]["value"], 90);
 
-    // Every value that holds still is what corbel show --json reads.
+    // Every value that holds still is what corbel show --json reads, entry for entry.
     for (const std::string& item : {kPtp4l, kPtpd}) {
         SCOPED_TRACE(item);
         const json shown =
@@ -98,11 +98,9 @@ TEST(ServeOnRealClocks, ShowsTheClocksWritesWithTheTokenOnlyAndFeedsPrometheus) 
                             .output)[item];
         const json served = json::parse(api.Get("/api/v1/clocks/" + item)->body)["values"];
         EXPECT_GE(shown.size(), 40u);
-        for (const auto& [tag, entry] : shown.items()) {
-            const std::string name = entry["name"];
+        for (const auto& [name, entry] : shown.items()) {
             if (!kChanging.contains(name)) {
-                EXPECT_EQ(served[name]["value"], entry["value"]) << name;
-                EXPECT_EQ(served[name]["tag"], tag) << name;
+                EXPECT_EQ(served[name], entry) << name;
             }
         }
     }
