@@ -143,6 +143,10 @@ TEST(ServeOnRealClocks, ShowsTheClocksWritesWithTheTokenOnlyAndFeedsPrometheus) 
     std::set<std::string> items = {series[0]["metric"]["item"], series[1]["metric"]["item"]};
     EXPECT_EQ(items, (std::set<std::string>{kPtp4l, kPtpd}));
     prometheus.stop();
+    // ptp4l refused TIME and UTC_PROPERTIES once, and was not asked for them again.
+    EXPECT_NE(
+        api.Get("/metrics")->body.find("corbel_exchanges_failed_total{reason=\"refused\"} 2\n"),
+        std::string::npos);
 
     EXPECT_EQ(serve.stop(), 0);  // SIGTERM ends it cleanly
     std::filesystem::remove_all(folder);
