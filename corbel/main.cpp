@@ -23,9 +23,9 @@ const char* const kFooter = R"(Exit codes:
   5  the expert library cannot be loaded or started (binding the PTP ports needs root)
 
 Discovery sends a management GET of CLOCK_DESCRIPTION in domains 0 to 3 and waits for
-answers: findClocksTimeout milliseconds (default 1000) from the file
-$QV_SETTINGS_ROOT/Software/Quarvel/Corbel/qv-1588/findClocksTimeout (root /etc/corbel when
-the variable is unset); --wait chooses the wait for one run.)";
+answers: findClocksTimeout milliseconds (default 1000) from $QV_FIND_CLOCKS_TIMEOUT, else
+from the file $QV_SETTINGS_ROOT/Software/Quarvel/Corbel/qv-1588/findClocksTimeout (root
+/etc/corbel when the variable is unset); --wait sets QV_FIND_CLOCKS_TIMEOUT for one run.)";
 
 void printTags(bool json) {
     nlohmann::json document = nlohmann::json::object();
