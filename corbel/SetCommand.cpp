@@ -58,7 +58,7 @@ std::string sentencesOf(const std::string& message) {
 // The expert checks the changed tags of `bag`, then writes them to the clock.
 ExitCode validateAndApply(const CommandContext& context, const std::string& item,
                           IkxSysPropertyBag2& bag) {
-    const std::u16string name = toUtf16(item);
+    const auto name = toUtf16(item);
     ComPtr<IkxSysEnumPropertyTag> accepted;
     OwnedBstr message;
     const HRESULT valid =

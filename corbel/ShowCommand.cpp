@@ -42,7 +42,7 @@ void printTable(const std::string& item, const PropertyValues& values,
     for (const Refusal& refusal : refusals) {
         for (const kxSysAttributeTagID tag : refusal.tags) {
             const TagInfo* info = findTag(tag);
-            rows[tag] = {info != nullptr ? info->type : 0u, "(refused)"};
+            rows[tag] = {info != nullptr ? static_cast<ULONG>(info->type) : ULONG{0}, "(refused)"};
         }
     }
     Table table;
@@ -63,7 +63,7 @@ void printTable(const std::string& item, const PropertyValues& values,
 std::vector<Refusal> readFromClock(const CommandContext& context, const std::string& item,
                                    const std::vector<kxSysAttributeTagID>& wanted,
                                    PropertyValues& values) {
-    const std::u16string name = toUtf16(item);
+    const auto name = toUtf16(item);
     std::vector<Refusal> refusals;
     for (const ReadGroup& group : readGroups()) {
         const auto tags = tagsToRead(group, wanted);

@@ -5,8 +5,6 @@
 #include <stdlib.h>
 
 #include <cstdint>
-#include <filesystem>
-#include <fstream>
 #include <string>
 #include <vector>
 
@@ -14,6 +12,8 @@
 #include "expert/CQVComPtr.h"
 #include "expert/CkxDynamicPropertyBag.h"
 #include "expert/clocks/CPtpSysExpert.h"
+#include "platform/EnvironmentVariable.h"
+#include "platform/FindClocksTimeout.h"
 #include "ptp/tManagementMessagePayload.h"
 #include "tests/expert/clocks/BagText.h"
 #include "tests/support/ptpmgmt/SimulatedNetwork.h"
@@ -41,17 +41,17 @@ struct NameCollector final : IkxSysItemCollector {
 // 02-11-22-FF-FE-33-44-55, after one discovery. Discovery waits 30 ms.
 class ExpertFixture : public ::testing::Test {
   protected:
-    static constexpr const char16_t* kPort1 = u"02-11-22-FF-FE-33-44-55:1";
+    static constexpr const OLECHAR* kPort1 = OLESTR("02-11-22-FF-FE-33-44-55:1");
 
-    // Settings and lock files of the test's own.
+    // The test's own discovery wait and (on POSIX) lock files.
     static void SetUpTestSuite() {
+        using qv::dsc::osdep::EnvironmentVariable;
+        EnvironmentVariable::set(qv::dsc::osdep::FindClocksTimeout::kOverrideVariable, "30");
+#ifndef _WIN32
         char folder[] = "/tmp/qv-expert-XXXXXX";
         ASSERT_NE(::mkdtemp(folder), nullptr);
-        const auto key = std::filesystem::path(folder) / "Software/Quarvel/Corbel/qv-1588";
-        std::filesystem::create_directories(key);
-        std::ofstream(key / "findClocksTimeout") << "30\n";
-        ::setenv("QV_SETTINGS_ROOT", folder, 1);
-        ::setenv("QV_LOCK_DIR", folder, 1);
+        EnvironmentVariable::set("QV_LOCK_DIR", folder);
+#endif
     }
     ExpertFixture() : clock(identity(0x55), 2) {
         network.attach(clock);
@@ -60,7 +60,9 @@ class ExpertFixture : public ::testing::Test {
         EXPECT_EQ(expert->GetItemNames(names.Receive()), S_OK);
         newRequests();
     }
-    ~ExpertFixture() override { expert->Shutdown(); }
+    ~ExpertFixture() override {
+        expert->Shutdown();
+    }
 
     static tExpert newExpert(nQVPTP000::iPTPPortMessaging& on) {
         CQVComObject<CPtpSysExpert>* created = nullptr;

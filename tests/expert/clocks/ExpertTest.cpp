@@ -4,6 +4,7 @@
 #include <algorithm>
 #include <functional>
 
+#include "platform/OleText.h"
 #include "ptp/tManagementIdTable.h"
 #include "tests/expert/clocks/ExpertFixture.h"
 
@@ -11,6 +12,7 @@ namespace {
 
 using namespace nQVPTP000;
 using namespace qvtest;
+using qv::dsc::OleText;
 using tIds = std::vector<std::uint16_t>;
 using tChange = std::function<void(IkxSysPropertyBag2&)>;
 const tIds kDiscovery(4, kClockDescription);  // one request per domain 0 to 3
@@ -24,12 +26,12 @@ TEST_F(ExpertFixture, ListingsRefreshEveryTimeAndAnItemLookupOnlyForAnUnknownNam
               (std::vector<std::string>{"02-11-22-FF-FE-33-44-55:1", "02-11-22-FF-FE-33-44-55:2"}));
     EXPECT_EQ(newRequests().size(), 2 * kDiscovery.size());
     CQVComPtr<IkxSysPropertyBag> bag;
-    EXPECT_EQ(expert->GetItem(u"02-11-22-ff-fe-33-44-55:1", bag.Receive()), S_OK);
+    EXPECT_EQ(expert->GetItem(OLESTR("02-11-22-ff-fe-33-44-55:1"), bag.Receive()), S_OK);
     EXPECT_EQ(newRequests(), tIds());
     SimulatedClock later(identity(0x56));
     network.attach(later);
     const kxSysAttributeTagID tag = kxQvPriority1;
-    const char16_t* laterName = u"02-11-22-FF-FE-33-44-56:1";
+    const OLECHAR* laterName = OLESTR("02-11-22-FF-FE-33-44-56:1");
     EXPECT_EQ(expert->GetItemProperties(laterName, 1, &tag, nullptr, bag.Receive()),
               CORBEL_E_ITEM_NOT_FOUND);
     EXPECT_EQ(newRequests(), tIds());
@@ -59,7 +61,7 @@ TEST_F(ExpertFixture, MisuseIsRefusedAndAFailureSaysWhy) {
         S_OK);
     BSTR description = nullptr;
     EXPECT_EQ(failure->GetLastFailure(&description, nullptr), S_OK);
-    const std::u16string text(description);
+    const std::u16string text = OleText::toLibrary(description);
     EXPECT_EQ(std::string(text.begin(), text.end()),
               "reading the clock's attributes: refused by the clock: GENERAL_ERROR (simulated "
               "failure) (status -52012)");
@@ -147,7 +149,7 @@ tChange real(double value) {
 }
 tChange text(std::size_t length) {
     return [=](IkxSysPropertyBag2& b) {
-        b.SetString(kxQvUserDescription, std::u16string(length, u'x').c_str());
+        b.SetString(kxQvUserDescription, std::basic_string<OLECHAR>(length, 'x').c_str());
     };
 }
 tChange seconds(std::int64_t value, std::uint64_t fraction = 0) {
@@ -199,7 +201,7 @@ TEST_F(ExpertFixture, ValidationAcceptsOrExplainsInChangedTagOrderAndSendsNothin
         BSTR message = nullptr;
         EXPECT_EQ(expert->ValidateChanges(nullptr, bag.get(), accepted.Receive(), &message),
                   c.result);
-        EXPECT_EQ(std::u16string(message != nullptr ? message : u""), c.message);
+        EXPECT_EQ(OleText::toLibrary(message), c.message);
         SysFreeString(message);
         tTags tags(c.accepted.size() + 1);
         ULONG fetched = 0;
@@ -237,10 +239,11 @@ TEST_F(ExpertFixture, ApplyWritesInChangedTagOrderAndStopsAtTheFirstFailure) {
     managed.failures.setters = true;
     EXPECT_EQ(expert->ApplyChanges(kPort1, bag.get(), nullptr), E_FAIL);
     EXPECT_EQ(newRequests(), tIds{kPriority1});
-    EXPECT_EQ(expert->ApplyChanges(u"02-11-22-FF-FE-33-44-55:9", bag.get(), nullptr), E_FAIL);
+    EXPECT_EQ(expert->ApplyChanges(OLESTR("02-11-22-FF-FE-33-44-55:9"), bag.get(), nullptr),
+              E_FAIL);
     bag->ClearChangedTags();
     u32(kxQvStepsRemoved, 1)(*bag.get());
-    EXPECT_EQ(expert->ApplyChanges(u"no clock", bag.get(), nullptr), S_OK);
+    EXPECT_EQ(expert->ApplyChanges(OLESTR("no clock"), bag.get(), nullptr), S_OK);
     EXPECT_EQ(newRequests(), tIds());
 }
 
