@@ -23,6 +23,8 @@ const char* charsetOf(std::uint32_t codePage) {
             return "US-ASCII";
         case CodePage::kJapanese:
             return "CP932";
+        case CodePage::kUtf8:
+            return "UTF-8";
         default:
             return nl_langinfo(CODESET);
     }
@@ -114,6 +116,9 @@ std::uint32_t CodePage::idOf(std::string_view localeName) {
     }
     if (localeName == "cp932") {
         return kJapanese;
+    }
+    if (localeName == "UTF-8") {
+        return kUtf8;
     }
     throw exception::InvalidLocale("_GetCodePageID", 58);
 }

@@ -10,17 +10,20 @@
 namespace qv::dsc {
 
 // Conversion between wide text (UTF-16, see BStr.h) and narrow text in a character set
-// named by a locale name. Three names are known, matched exactly, case included:
+// named by a locale name. Four names are known, matched exactly, case included:
 //   ""          the character set of the process's current locale (LC_CTYPE, as the
 //               process has set it; the library never changes the locale), code page 0;
 //   "US-ASCII"  ASCII, code page 20127;
-//   "cp932"     the Japanese double-byte set CP932, code page 932.
+//   "cp932"     the Japanese double-byte set CP932, code page 932;
+//   "UTF-8"     UTF-8, code page 65001: the encoding of PTP texts on the wire, which every
+//               wide text has (a lone surrogate still throws).
 // Any other name throws qv::dsc::exception::InvalidLocale.
 class CodePage {
   public:
     static constexpr std::uint32_t kCurrentLocale = 0;
     static constexpr std::uint32_t kUsAscii = 20127;
     static constexpr std::uint32_t kJapanese = 932;
+    static constexpr std::uint32_t kUtf8 = 65001;
 
     // What becomes of narrow text that is not valid in its set.
     enum class tInvalidText {

@@ -95,6 +95,9 @@ std::uint32_t CodePage::idOf(std::string_view localeName) {
     if (localeName == "cp932") {
         return kJapanese;
     }
+    if (localeName == "UTF-8") {
+        return kUtf8;
+    }
     throw exception::InvalidLocale("_GetCodePageID", 58);
 }
 

@@ -169,9 +169,13 @@ void CPtpAttributeReader::readDescription(iPTPClockProxy& proxy, bool refresh, C
 
 HRESULT CPtpAttributeReader::fillBaseProperties(const std::u16string& itemName,
                                                 iPTPClockProxy* proxy, IkxSysPropertyBag2& bag) {
+    // A clock is named after its port identity, whatever spelling found it: a host that keys
+    // its items by name must see one item per clock.
+    const std::u16string name =
+        proxy != nullptr ? F::portIdentity(proxy->getPortIdentity()) : itemName;
     CPtpBagFiller filler(bag);
     filler.setLong(kxSysTag101C000, 1)
-        .setString(kxSysItemName, itemName)
+        .setString(kxSysItemName, name)
         .setLong(kxSysTag102A000, -200)
         .setBool(kxSysTag1001000, true)
         .setString(kxSysTag1004000, u"")
@@ -182,7 +186,7 @@ HRESULT CPtpAttributeReader::fillBaseProperties(const std::u16string& itemName,
         .setString(kxSysTag1007000, u"")
         .setULong(kxSysTag1037000, 0x10001)
         .setBool(kxQvExpertItem, true)
-        .setString(kxQvClockPortName, itemName);
+        .setString(kxQvClockPortName, name);
     if (!filler.succeeded()) {
         return filler.result();
     }
@@ -209,26 +213,29 @@ HRESULT CPtpAttributeReader::readRequested(iPTPClockProxy& proxy, ULONG count,
         }
         baseTagAsked = baseTagAsked || (row != nullptr && row->source == kxQvSource::constant);
     }
-    CPtpBagFiller filler(bag);
     ULONG served = 0;
-    bool allRead = true;
+    HRESULT outcome = S_OK;
     for (std::size_t group = 0; group < kxQvClockSources; ++group) {
         if (requested[group] == 0) {
             continue;
         }
+        // Each group has an outcome of its own: one that fails leaves the others alone.
+        CPtpBagFiller filler(bag);
         tStatus status;
         kGroupReaders[group](proxy, filler, status);
         if (status.succeeded() && filler.succeeded()) {
             served += requested[group];
-        } else {
-            if (allRead) {
-                failure = status;
-            }
-            allRead = false;
+            continue;
+        }
+        if (filler.result() == E_OUTOFMEMORY || status.code == kStatusNoMemory) {
+            outcome = E_OUTOFMEMORY;
+        } else if (outcome == S_OK) {
+            failure = status;
+            outcome = E_FAIL;
         }
     }
-    if (!allRead) {
-        return E_FAIL;
+    if (FAILED(outcome)) {
+        return outcome;
     }
     if (served == count) {
         return S_OK;

@@ -6,8 +6,6 @@
 #include "expert/CQVComPtr.h"
 #include "expert/clocks/CPtpValueFormat.h"
 #include "platform/BStr.h"
-#include "platform/CodePage.h"
-#include "platform/Exception.h"
 
 namespace {
 
@@ -23,15 +21,17 @@ struct tChangedValue {
     kxSysAttrTimestampUTC time{};
 };
 
+// Octets of UTF-8, as PTP carries texts.
 constexpr std::size_t kMaxUserDescription = 128;
 
-// Lone surrogates have no narrow form: the description is then not valid.
-std::optional<std::string> narrowText(const std::u16string& text) {
-    try {
-        return qv::dsc::WideToAnsi(text, "");
-    } catch (const qv::dsc::exception::Exception&) {
+// The description as it goes on the wire; nothing for a text without a faithful form there:
+// a lone surrogate (no UTF-8), or a NUL, which would end the text early.
+std::optional<std::string> wireText(const std::u16string& text) {
+    auto octets = CPtpValueFormat::ptpText(text);
+    if (!octets || octets->find('\0') != std::string::npos) {
         return std::nullopt;
     }
+    return octets;
 }
 
 bool interval(const tChangedValue& v) {
@@ -57,15 +57,16 @@ struct tSettableRule {
     void (*apply)(iPTPClockProxy&, const tChangedValue&, tStatus&);
 };
 
-// The checks, sentences and requests of the settable tags (their types: kxQvAttributes).
-const tSettableRule kRules[] = {
+// The checks, sentences and requests of the settable tags; their types, and which tags are
+// settable at all, are kxQvAttributes' (checked below).
+constexpr tSettableRule kRules[] = {
     {kxQvUserDescription, u"User Description must be a string <= 128 chars.  ",
      [](const tChangedValue& v) {
-         const auto narrow = narrowText(v.text);
-         return narrow && narrow->size() <= kMaxUserDescription;
+         const auto octets = wireText(v.text);
+         return octets && octets->size() <= kMaxUserDescription;
      },
      [](iPTPClockProxy& p, const tChangedValue& v, tStatus& s) {
-         p.setUserDescription(narrowText(v.text).value_or("").c_str(), s);
+         p.setUserDescription(wireText(v.text).value_or("").c_str(), s);
      }},
     {kxQvDomainNumber, u"Domain must be an integer within the range 0 (PTP default domain) to 3.  ",
      [](const tChangedValue& v) { return v.unsignedValue <= 3; },
@@ -120,6 +121,23 @@ const tSettableRule kRules[] = {
          }
      }},
 };
+
+// One rule for each tag that the attribute table marks settable, and for no other.
+constexpr bool rulesMatchTable() {
+    std::size_t settable = 0;
+    for (const kxQvAttribute& row : kxQvAttributes) {
+        bool ruled = false;
+        for (const tSettableRule& rule : kRules) {
+            ruled = ruled || rule.tag == row.tag;
+        }
+        if (ruled != row.settable) {
+            return false;
+        }
+        settable += row.settable ? 1 : 0;
+    }
+    return settable == std::size(kRules);
+}
+static_assert(rulesMatchTable(), "every settable tag of kxQvAttributes has one rule");
 
 const tSettableRule* ruleOf(kxSysAttributeTagID tag) {
     for (const tSettableRule& rule : kRules) {
@@ -220,26 +238,28 @@ HRESULT CPtpAttributeWriter::validate(IkxSysPropertyBag& bag, tTagSet& accepted,
 }
 
 HRESULT CPtpAttributeWriter::apply(IkxSysPropertyBag& bag, const tClockLookup& lookup,
-                                   tStatus& failure) {
+                                   tApplyFailure& failure) {
     iPTPClockProxy* proxy = nullptr;
     for (const kxSysAttributeTagID tag : changedTags(bag)) {
         const tSettableRule* rule = ruleOf(tag);
         if (rule == nullptr) {
             continue;
         }
+        failure.tag = tag;
         if (proxy == nullptr && (proxy = lookup()) == nullptr) {
             return E_FAIL;
         }
+        // A host may skip validation: a value it would reject is never sent, and nothing after.
         const auto value = readChanged(bag, tag);
         if (!value || !rule->valid(*value)) {
-            continue;
+            failure.sentence = rule->message;
+            return CORBEL_E_INVALID_VALUE;
         }
-        tStatus status;
-        rule->apply(*proxy, *value, status);
-        if (status.failed()) {
-            failure = status;
+        rule->apply(*proxy, *value, failure.status);
+        if (failure.status.failed()) {
             return E_FAIL;
         }
     }
+    failure.tag = 0;
     return S_OK;
 }

@@ -21,10 +21,19 @@ class CPtpAttributeWriter {
     // CORBEL_E_INVALID_VALUE when one was rejected, S_FALSE when nothing settable changed.
     static HRESULT validate(IkxSysPropertyBag& bag, tTagSet& accepted, std::u16string& message);
 
+    // Where and why a write stopped.
+    struct tApplyFailure {
+        kxSysAttributeTagID tag = 0;  // the tag it stopped at
+        tStatus status;               // the request's failure, when one was sent
+        std::u16string sentence;      // validation's sentence, for a value it rejects
+    };
+
     // Sends one SET or COMMAND per changed settable tag in the bag's order and stops at the
-    // first that fails (E_FAIL, its status in `failure`); a tag whose value cannot be read
-    // in its type is skipped.
-    static HRESULT apply(IkxSysPropertyBag& bag, const tClockLookup& lookup, tStatus& failure);
+    // first that fails: E_FAIL when the clock is unknown or the request fails,
+    // CORBEL_E_INVALID_VALUE (nothing sent for it) when validation would reject the value or
+    // it cannot be read in its tag's type. Earlier tags stay written.
+    static HRESULT apply(IkxSysPropertyBag& bag, const tClockLookup& lookup,
+                         tApplyFailure& failure);
 };
 
 #endif

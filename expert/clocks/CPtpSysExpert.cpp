@@ -52,7 +52,8 @@ std::span<const QVInterfaceEntry> CPtpSysExpert::InterfaceTable() {
     static constexpr QVInterfaceEntry kTable[] = {
         QVInterface<CPtpSysExpert, IkxSysExpert2>(IID_IkxSysExpert2),
         QVInterface<CPtpSysExpert, IkxSysExpert>(IID_IkxSysExpert),
-        QVInterface<CPtpSysExpert, IkxQvLastFailure>(IID_IkxQvLastFailure),
+        QVInterface<CPtpSysExpert, IkxQvLastFailure2>(IID_IkxQvLastFailure2),
+        QVInterface<CPtpSysExpert, IkxQvLastFailure2>(IID_IkxQvLastFailure),
     };
     return kTable;
 }
@@ -283,6 +284,7 @@ HRESULT CPtpSysExpert::ReservedOperation2(void* /*reserved*/) {
 HRESULT CPtpSysExpert::ValidateChanges(const OLECHAR* /*name*/, IkxSysPropertyBag* changes,
                                        IkxSysEnumPropertyTag** accepted, BSTR* message) {
     return QVGuardedSlot([&]() -> HRESULT {
+        CPtpLastFailure::clear();
         if (message != nullptr) {
             *message = nullptr;
         }
@@ -329,14 +331,20 @@ HRESULT CPtpSysExpert::ApplyChanges(const OLECHAR* name, IkxSysPropertyBag* chan
             return E_NOT_VALID_STATE;
         }
         const std::u16string itemName = textOf(name);
-        tStatus failure;
+        CPtpAttributeWriter::tApplyFailure failure;
         // An unknown item fails as a write that could not be made: E_FAIL.
         const HRESULT applied = CPtpAttributeWriter::apply(
             *changes, [&] { return CPtpClockList::lookup(*node, itemName); }, failure);
-        if (applied == E_FAIL) {
-            CPtpLastFailure::record(failure.failed() ? "writing a changed attribute to the clock"
-                                                     : "no clock is known under the item name",
-                                    failure);
+        if (applied == CORBEL_E_INVALID_VALUE) {
+            CPtpLastFailure::recordInvalid(failure.tag, failure.sentence);
+        } else if (applied == E_FAIL) {
+            const kxQvAttribute* row = kxQvFindAttribute(failure.tag);
+            const std::string step = failure.status.failed()
+                                         ? std::string("writing ") +
+                                               (row != nullptr ? row->name : "a value") +
+                                               " to the clock"
+                                         : std::string("no clock is known under the item name");
+            CPtpLastFailure::record(step.c_str(), failure.status, failure.tag);
         }
         return applied;
     });
@@ -344,4 +352,9 @@ HRESULT CPtpSysExpert::ApplyChanges(const OLECHAR* name, IkxSysPropertyBag* chan
 
 HRESULT CPtpSysExpert::GetLastFailure(BSTR* description, BSTR* trace) {
     return QVGuardedSlot([&] { return CPtpLastFailure::get(description, trace); });
+}
+
+HRESULT CPtpSysExpert::GetLastFailureCause(ULONG* kind, ULONG* managementErrorId,
+                                           kxSysAttributeTagID* tag) {
+    return CPtpLastFailure::getCause(kind, managementErrorId, tag);
 }

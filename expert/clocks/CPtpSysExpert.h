@@ -20,12 +20,13 @@
 // The expert: every PTP clock port that answers management messages on the network is an
 // item whose attributes the host reads and changes. Created as CQVComObject<CPtpSysExpert>.
 //
-// Why an operation failed is kept per calling thread (IkxQvLastFailure, CPtpLastFailure).
+// Why an operation failed is kept per calling thread (IkxQvLastFailure and its second
+// version, CPtpLastFailure).
 //
 // Threads: the host may call every operation from several threads at once. Initialize and
 // Shutdown are serialised by `lifeLock_`; item operations see the node only once it is open.
 class CPtpSysExpert : public IkxSysExpert2,
-                      public IkxQvLastFailure,
+                      public IkxQvLastFailure2,
                       public virtual CQVComObjectRootEx<CQVComMultiThreadModelNoCS> {
   public:
     static constexpr const char16_t* kDisplayName = u"QV-1588 2008";
@@ -57,6 +58,8 @@ class CPtpSysExpert : public IkxSysExpert2,
     HRESULT KXSYS_CALL ApplyChanges(const OLECHAR* name, IkxSysPropertyBag* changes,
                                     ULONG* result) override;
     HRESULT KXSYS_CALL GetLastFailure(BSTR* description, BSTR* trace) override;
+    HRESULT KXSYS_CALL GetLastFailureCause(ULONG* kind, ULONG* managementErrorId,
+                                           kxSysAttributeTagID* tag) override;
 
   protected:
     CPtpSysExpert() = default;

@@ -2,8 +2,11 @@
 
 #include <cmath>
 #include <cstdio>
+#include <cstdlib>
+#include <cstring>
 
 #include "platform/CodePage.h"
+#include "platform/Exception.h"
 
 namespace {
 
@@ -11,6 +14,16 @@ void appendAscii(std::u16string& target, const char* text) {
     for (; *text != '\0'; ++text) {
         target.push_back(static_cast<char16_t>(*text));
     }
+}
+
+// At most five decimal digits that make a number up to 65535.
+bool parsePort(const char* digits, unsigned long& port) {
+    const std::size_t length = std::strlen(digits);
+    if (length == 0 || length > 5) {
+        return false;
+    }
+    port = std::strtoul(digits, nullptr, 10);
+    return port <= 0xFFFF;
 }
 
 }  // namespace
@@ -51,11 +64,13 @@ std::optional<nQVPTPMGMT000::tClockKey> CPtpValueFormat::clockKeyOf(std::u16stri
         narrow.push_back(unit < 0x80 ? static_cast<char>(unit) : '?');
     }
     unsigned fields[8] = {};
-    int port = 0;
+    char port[8] = {};
     const int converted =
-        std::sscanf(narrow.c_str(), "%X-%X-%X-%X-%X-%X-%X-%X:%d", &fields[0], &fields[1],
-                    &fields[2], &fields[3], &fields[4], &fields[5], &fields[6], &fields[7], &port);
-    if (converted != 9) {
+        std::sscanf(narrow.c_str(), "%X-%X-%X-%X-%X-%X-%X-%X:%7[0-9]", &fields[0], &fields[1],
+                    &fields[2], &fields[3], &fields[4], &fields[5], &fields[6], &fields[7], port);
+    // The port is a decimal number of 16 bits: "65537" or "-65535" must not wrap to port 1.
+    unsigned long portNumber = 0;
+    if (converted != 9 || !parsePort(port, portNumber)) {
         return std::nullopt;
     }
     nQVPTPMGMT000::tClockKey key{};
@@ -65,7 +80,6 @@ std::optional<nQVPTPMGMT000::tClockKey> CPtpValueFormat::clockKeyOf(std::u16stri
         }
         key[i] = static_cast<std::uint8_t>(fields[i]);
     }
-    const auto portNumber = static_cast<std::uint16_t>(port);
     key[8] = static_cast<std::uint8_t>(portNumber >> 8);
     key[9] = static_cast<std::uint8_t>(portNumber & 0xFF);
     return key;
@@ -77,11 +91,13 @@ kxSysAttrTimestampUTC CPtpValueFormat::hostTimeOf(const nQVPTP000::tTimestamp& t
 }
 
 std::optional<nQVPTP000::tTimestamp> CPtpValueFormat::ptpTimeOf(const kxSysAttrTimestampUTC& time) {
-    const auto seconds = static_cast<std::uint64_t>(time.seconds);
-    if (seconds < static_cast<std::uint64_t>(kSecondsFrom1904To1970)) {
+    // Signed: a time before 1904 must not wrap into a huge count of seconds.
+    if (time.seconds < kSecondsFrom1904To1970 ||
+        time.seconds - kSecondsFrom1904To1970 > kLastPtpSecond) {
         return std::nullopt;
     }
-    return nQVPTP000::tTimestamp(seconds - kSecondsFrom1904To1970, 0);
+    return nQVPTP000::tTimestamp(static_cast<std::uint64_t>(time.seconds - kSecondsFrom1904To1970),
+                                 0);
 }
 
 double CPtpValueFormat::nanosecondsOf(const nQVPTP000::tTimeInterval& interval) {
@@ -94,14 +110,22 @@ double CPtpValueFormat::varianceOf(std::uint16_t scaledLogVariance) {
 
 std::u16string CPtpValueFormat::clockText(std::string_view text) {
     try {
-        return qv::dsc::AnsiToWide(text, "");
-    } catch (...) {
-        // Not valid in the host's character set: keep what ASCII there is.
+        return qv::dsc::AnsiToWide(text, "UTF-8");
+    } catch (const qv::dsc::exception::Exception&) {
+        // The converter itself could not be made: keep what ASCII there is.
         std::u16string result;
         for (const char octet : text) {
             const auto unit = static_cast<unsigned char>(octet);
             result.push_back(unit < 0x80 ? static_cast<char16_t>(unit) : u'\uFFFD');
         }
         return result;
+    }
+}
+
+std::optional<std::string> CPtpValueFormat::ptpText(std::u16string_view text) {
+    try {
+        return qv::dsc::WideToAnsi(text, "UTF-8");
+    } catch (const qv::dsc::exception::Exception&) {
+        return std::nullopt;  // a lone surrogate has no UTF-8 form
     }
 }

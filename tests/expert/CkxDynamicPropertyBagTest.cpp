@@ -69,6 +69,8 @@ TEST(CkxDynamicPropertyBagTest, TagsKeepTheirTypeAndClonesCopyThem) {
         }
     }
     ASSERT_EQ(bag->ClearChangedTags(), S_OK);
+    EXPECT_EQ(kTypes[1].first(*bag, kTag), CORBEL_E_TYPE_MISMATCH);  // kTag holds a bool
+    EXPECT_EQ(bag->ClearChangedTags(), S_FALSE);  // and the refused setter changed nothing
     BagPtr copy;
     ASSERT_EQ(bag->Clone(copy.Receive()), S_OK);
     bag.reset();

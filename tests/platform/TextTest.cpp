@@ -14,7 +14,8 @@ TEST(CodePageTest, KnownNamesAreMatchedExactly) {
     EXPECT_EQ(CodePage::idOf(""), 0U);
     EXPECT_EQ(CodePage::idOf("US-ASCII"), 20127U);
     EXPECT_EQ(CodePage::idOf("cp932"), 932U);
-    for (const char* name : {"CP932", "us-ascii", "UTF-8", "cp932 "}) {
+    EXPECT_EQ(CodePage::idOf("UTF-8"), 65001U);
+    for (const char* name : {"CP932", "us-ascii", "utf-8", "cp932 "}) {
         try {
             CodePage::idOf(name);
             ADD_FAILURE() << name;
@@ -34,6 +35,12 @@ TEST(CodePageTest, TextConvertsBothWaysAndUnrepresentableBecomesQuestionMark) {
     const std::string narrow = qv::dsc::WideToAnsi(japanese, "cp932");
     EXPECT_EQ(narrow, expected);
     EXPECT_EQ(qv::dsc::AnsiToWide(narrow, "cp932"), japanese);
+    // "Zürich – 東京" in UTF-8: ü C3 BC, en dash E2 80 93, 東 E6 9D B1, 京 E4 BA AC; and
+    // U+1F600 as F0 9F 98 80.
+    const std::u16string zurich = u"Z\u00FCrich \u2013 \u6771\u4EAC \U0001F600";
+    const std::string utf8 = "Z\xC3\xBCrich \xE2\x80\x93 \xE6\x9D\xB1\xE4\xBA\xAC \xF0\x9F\x98\x80";
+    EXPECT_EQ(qv::dsc::WideToAnsi(zurich, "UTF-8"), utf8);
+    EXPECT_EQ(qv::dsc::AnsiToWide(utf8, "UTF-8"), zurich);
     // U+65E5 and the pair D83D DE00 (one character outside the basic plane) are not ASCII.
     EXPECT_EQ(qv::dsc::WideToAnsi(u"a\u65E5b\U0001F600c", "US-ASCII"), "a?b?c");
     EXPECT_EQ(qv::dsc::WideToAnsi(u"", "cp932"), "");
@@ -43,6 +50,7 @@ TEST(CodePageTest, TextConvertsBothWaysAndUnrepresentableBecomesQuestionMark) {
 TEST(CodePageTest, MalformedInputThrowsOnlyWhenStrict) {
     const char16_t loneSurrogate[] = {u'a', 0xD800, u'b'};
     EXPECT_THROW(qv::dsc::WideToAnsi(std::u16string_view(loneSurrogate, 3), "cp932"), WinError);
+    EXPECT_THROW(qv::dsc::WideToAnsi(std::u16string_view(loneSurrogate, 3), "UTF-8"), WinError);
     // 0x81 opens a double-byte code that never comes.
     constexpr auto strict = qv::dsc::CodePage::tInvalidText::kThrow;
     EXPECT_THROW(qv::dsc::AnsiToWide("ab\x81", "cp932", strict), WinError);

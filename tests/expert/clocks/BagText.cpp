@@ -32,7 +32,8 @@ std::string textOf(IkxSysPropertyBag& bag, kxSysAttributeTagID tag) {
         case kxSysPropertyTypeString:
             bag.GetString(tag, &text);
             for (const OLECHAR* unit = text; unit != nullptr && *unit != 0; ++unit) {
-                narrow.push_back(*unit < 0x80 ? static_cast<char>(*unit) : '?');
+                std::snprintf(printed, sizeof printed, "\\u%04X", static_cast<unsigned>(*unit));
+                narrow += *unit < 0x80 ? std::string(1, static_cast<char>(*unit)) : printed;
             }
             SysFreeString(text);
             return narrow;

@@ -9,7 +9,8 @@
 namespace qvtest {
 
 // A bag's value as text: numbers in decimal, doubles with one decimal ("-1.0", "inf"),
-// strings as ASCII, timestamps as "seconds+fraction"; "(none)" when the tag is missing.
+// strings in ASCII with "\\uXXXX" for other code units, timestamps as "seconds+fraction"; "(none)"
+// when the tag is missing.
 std::string textOf(IkxSysPropertyBag& bag, kxSysAttributeTagID tag);
 
 // Every tag that GetItemProperties reads.

@@ -6,6 +6,7 @@
 
 #include <cstdint>
 #include <string>
+#include <tuple>
 #include <vector>
 
 #include "expert/CQVComObject.h"
@@ -14,6 +15,7 @@
 #include "expert/clocks/CPtpSysExpert.h"
 #include "platform/EnvironmentVariable.h"
 #include "platform/FindClocksTimeout.h"
+#include "platform/OleText.h"
 #include "ptp/tManagementMessagePayload.h"
 #include "tests/expert/clocks/BagText.h"
 #include "tests/support/ptpmgmt/SimulatedNetwork.h"
@@ -21,6 +23,8 @@
 namespace qvtest {
 
 using tTags = std::vector<kxSysAttributeTagID>;
+// What IkxQvLastFailure2 says: kind, managementErrorId, tag.
+using tCause = std::tuple<kxQvFailureKind, ULONG, kxSysAttributeTagID>;
 using tExpert = CQVComPtr<CQVComObject<CPtpSysExpert>>;
 
 // A host's item collector that keeps the item names it is given.
@@ -86,6 +90,26 @@ class ExpertFixture : public ::testing::Test {
     HRESULT read(const tTags& tags, CQVComPtr<IkxSysPropertyBag>& bag) {
         return expert->GetItemProperties(kPort1, static_cast<ULONG>(tags.size()), tags.data(),
                                          nullptr, bag.Receive());
+    }
+    // Why the calling thread's last operation failed, in words (ASCII) and as numbers.
+    std::string lastFailure() {
+        CQVComPtr<IkxQvLastFailure2> failure;
+        EXPECT_EQ(expert->QueryInterface(IID_IkxQvLastFailure2,
+                                         reinterpret_cast<void**>(failure.Receive())),
+                  S_OK);
+        BSTR description = nullptr;
+        failure->GetLastFailure(&description, nullptr);
+        const std::u16string text = qv::dsc::OleText::toLibrary(description);
+        SysFreeString(description);
+        return std::string(text.begin(), text.end());
+    }
+    tCause lastCause() {
+        ULONG kind = 0;
+        tCause cause;
+        static_cast<IkxQvLastFailure2*>(expert.get())
+            ->GetLastFailureCause(&kind, &std::get<1>(cause), &std::get<2>(cause));
+        std::get<0>(cause) = static_cast<kxQvFailureKind>(kind);
+        return cause;
     }
     // The management ids of the requests sent since the last call.
     std::vector<std::uint16_t> newRequests() {

@@ -106,6 +106,10 @@ TEST(ExpertOnRealClocks, FindsReadsWritesAndLeavesNothingBehind) {
         expert->Release();
     }
     EXPECT_EQ(entriesOf("/proc/self/fd"), descriptors);
+    // A joined thread leaves the task list a moment after join returns: wait for it.
+    for (int i = 0; i < 500 && entriesOf("/proc/self/task") != threads; ++i) {
+        std::this_thread::sleep_for(10ms);
+    }
     EXPECT_EQ(entriesOf("/proc/self/task"), threads);
 
     IkxSysExpert2* expert = nullptr;
@@ -164,13 +168,22 @@ TEST(ExpertOnRealClocks, FindsReadsWritesAndLeavesNothingBehind) {
                     [](IkxSysPropertyBag2& b) {
                         b.SetULong(kxQvPriority1, 77);
                         b.SetULong(kxQvPriority2, 78);
-                        b.SetString(kxQvUserDescription, u"renamed;by;qv");
+                        b.SetString(kxQvUserDescription, u"Z\u00FCrich \u2013 \u6771\u4EAC");
                         b.SetLong(kxQvLogAnnounceInterval, 2);
                     }),
               S_OK);
     EXPECT_EQ(pmcValues(network, ptpd, "PRIORITY1")["priority1"], "77");
     EXPECT_EQ(pmcValues(network, ptpd, "PRIORITY2")["priority2"], "78");
-    EXPECT_EQ(pmcValues(network, ptpd, "USER_DESCRIPTION")["userDescription"], "renamed;by;qv");
+    // PTP texts are UTF-8, whatever the locale (this process sets none).
+    EXPECT_EQ(pmcValues(network, ptpd, "USER_DESCRIPTION")["userDescription"],
+              "Z\xC3\xBCrich \xE2\x80\x93 \xE6\x9D\xB1\xE4\xBA\xAC");
+    IkxSysPropertyBag* readBack = nullptr;
+    const kxSysAttributeTagID description = kxQvUserDescription;
+    EXPECT_EQ(
+        expert->GetItemProperties(itemNameOf(ptpd).c_str(), 1, &description, nullptr, &readBack),
+        S_OK);
+    EXPECT_EQ(textOf(*readBack, kxQvUserDescription), "Z\\u00FCrich \\u2013 \\u6771\\u4EAC");
+    readBack->Release();
     EXPECT_EQ(pmcValues(network, ptpd, "LOG_ANNOUNCE_INTERVAL")["logAnnounceInterval"], "2");
     EXPECT_EQ(write(ptpd, [](IkxSysPropertyBag2& b) { b.SetBool(kxQvPortEnabled, 0); }), S_OK);
     EXPECT_EQ(pmcValues(network, ptpd, "PORT_DATA_SET")["portState"], "DISABLED");
