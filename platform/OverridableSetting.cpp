@@ -14,4 +14,11 @@ std::optional<std::uint32_t> OverridableSetting::readNumber() const {
     return SettingsStore(keyPath).readNumber(valueName);
 }
 
+std::optional<std::string> OverridableSetting::readText() const {
+    if (std::optional<std::string> text = EnvironmentVariable::read(variable)) {
+        return text;
+    }
+    return SettingsStore(keyPath).readText(valueName);
+}
+
 }  // namespace qv::dsc::osdep

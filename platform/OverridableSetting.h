@@ -3,6 +3,7 @@
 
 #include <cstdint>
 #include <optional>
+#include <string>
 
 namespace qv::dsc::osdep {
 
@@ -21,6 +22,8 @@ struct OverridableSetting {
     // parseNumber), else the stored number; nothing when neither has one. A variable that
     // holds no number is ignored.
     std::optional<std::uint32_t> readNumber() const;
+    // The variable's text when it is set and not empty, else the stored text.
+    std::optional<std::string> readText() const;
 };
 
 }  // namespace qv::dsc::osdep

@@ -16,7 +16,8 @@ namespace qv::dsc::osdep {
 // (see parseNumber).
 //
 // Windows (SettingsStoreWin32.cpp): the registry key of that path under HKEY_LOCAL_MACHINE,
-// opened read-only (created when the caller may); a number is a REG_DWORD value.
+// opened read-only (created when the caller may); a number is a REG_DWORD value, a text a
+// REG_SZ value, given in the process's code page.
 class SettingsStore {
   public:
     static constexpr const char* kRootVariable = "QV_SETTINGS_ROOT";
@@ -29,6 +30,9 @@ class SettingsStore {
     // The stored number, or nothing when the key, the value or a valid 32-bit number in it
     // is missing. A value name that holds '/' or is "." or ".." is never found.
     std::optional<std::uint32_t> readNumber(std::string_view valueName) const;
+    // The stored text as it is (at most 4096 octets), or nothing when the value is missing,
+    // longer, or named as readNumber never finds.
+    std::optional<std::string> readText(std::string_view valueName) const;
 
     // Where the values are: the folder on POSIX, the key path on Windows.
     const std::string& location() const { return location_; }

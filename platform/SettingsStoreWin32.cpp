@@ -1,5 +1,8 @@
 #include <windows.h>
 
+#include "platform/CodePage.h"
+#include "platform/Exception.h"
+#include "platform/OleText.h"
 #include "platform/SettingsStore.h"
 
 namespace qv::dsc::osdep {
@@ -9,6 +12,13 @@ namespace qv::dsc::osdep {
 namespace {
 
 constexpr wchar_t kKeyClass[] = L"qv-1588";
+// Far more than any text setting of ours: a larger value is not one.
+constexpr DWORD kMaxTextOctets = 8192;
+
+bool isValueName(std::string_view name) {
+    return !name.empty() && name != "." && name != ".." &&
+           name.find_first_of(std::string_view("/\0", 2)) == name.npos;
+}
 
 // The key path as the registry spells it: segments joined by '\', "." and ".." dropped.
 std::string registryPath(std::string_view keyPath) {
@@ -82,11 +92,26 @@ class tRegistryKey {
 SettingsStore::SettingsStore(std::string_view keyPath) : location_(registryPath(keyPath)) {}
 
 std::optional<std::uint32_t> SettingsStore::readNumber(std::string_view valueName) const {
-    if (valueName.empty() || valueName == "." || valueName == ".." ||
-        valueName.find_first_of(std::string_view("/\0", 2)) != valueName.npos) {
+    if (!isValueName(valueName)) {
         return std::nullopt;
     }
     return tRegistryKey(wide(location_)).readNumber(wide(valueName));
+}
+
+std::optional<std::string> SettingsStore::readText(std::string_view valueName) const {
+    wchar_t text[kMaxTextOctets / sizeof(wchar_t)] = {};
+    DWORD size = sizeof(text);
+    if (!isValueName(valueName) ||
+        RegGetValueW(HKEY_LOCAL_MACHINE, wide(location_).c_str(), wide(valueName).c_str(),
+                     RRF_RT_REG_SZ, nullptr, text, &size) != ERROR_SUCCESS) {
+        return std::nullopt;
+    }
+    try {
+        // The process's code page, as the environment gives its variables.
+        return CodePage::wideToAnsi(OleText::toLibrary(text), "");
+    } catch (const exception::Exception&) {
+        return std::nullopt;
+    }
 }
 
 }  // namespace qv::dsc::osdep

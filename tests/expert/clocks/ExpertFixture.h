@@ -47,14 +47,12 @@ class ExpertFixture : public ::testing::Test {
   protected:
     static constexpr const OLECHAR* kPort1 = OLESTR("02-11-22-FF-FE-33-44-55:1");
 
-    // The test's own discovery wait and (on POSIX) lock files.
+    // Lock files of the test's own (on POSIX).
     static void SetUpTestSuite() {
-        using qv::dsc::osdep::EnvironmentVariable;
-        EnvironmentVariable::set(qv::dsc::osdep::FindClocksTimeout::kOverrideVariable, "30");
 #ifndef _WIN32
         char folder[] = "/tmp/qv-expert-XXXXXX";
         ASSERT_NE(::mkdtemp(folder), nullptr);
-        EnvironmentVariable::set("QV_LOCK_DIR", folder);
+        qv::dsc::osdep::EnvironmentVariable::set("QV_LOCK_DIR", folder);
 #endif
     }
     ExpertFixture() : clock(identity(0x55), 2) {
@@ -68,7 +66,10 @@ class ExpertFixture : public ::testing::Test {
         expert->Shutdown();
     }
 
-    static tExpert newExpert(nQVPTP000::iPTPPortMessaging& on) {
+    // An expert whose discovery waits `waitMs`.
+    static tExpert newExpert(nQVPTP000::iPTPPortMessaging& on, unsigned waitMs = 30) {
+        qv::dsc::osdep::EnvironmentVariable::set(
+            qv::dsc::osdep::FindClocksTimeout::kOverrideVariable, std::to_string(waitMs).c_str());
         CQVComObject<CPtpSysExpert>* created = nullptr;
         EXPECT_EQ(CQVComObject<CPtpSysExpert>::CreateInstance(&created), S_OK);
         tExpert held(created);
