@@ -11,18 +11,8 @@
 #include <qv1588/qv1588.h>
 
 #include <cstdio>
-#include <string>
 
 namespace {
-
-// The clocks' texts here are ASCII.
-std::string narrow(const OLECHAR* text) {
-    std::string result;
-    for (; text != nullptr && *text != 0; ++text) {
-        result.push_back(*text < 0x80 ? static_cast<char>(*text) : '?');
-    }
-    return result;
-}
 
 bool check(HRESULT result, const char* step) {
     if (result != S_OK) {
@@ -31,7 +21,8 @@ bool check(HRESULT result, const char* step) {
     return result == S_OK;
 }
 
-bool printItem(IkxSysExpert2& expert, const OLECHAR* name) {
+// One item's line; the clocks' texts here are ASCII.
+bool printItem(IkxSysExpert2& expert, BSTR name) {
     const kxSysAttributeTagID tags[] = {kxQvPriority1, kxQvUserDescription};
     IkxSysPropertyBag* bag = nullptr;
     ULONG priority1 = 0;
@@ -39,27 +30,14 @@ bool printItem(IkxSysExpert2& expert, const OLECHAR* name) {
     const bool read = check(expert.GetItemProperties(name, 2, tags, nullptr, &bag), "read") &&
                       check(bag->GetULong(kxQvPriority1, &priority1), "GetULong") &&
                       check(bag->GetString(kxQvUserDescription, &description), "GetString");
-    std::printf("%s priority1=%lu userDescription=%s\n", narrow(name).c_str(), priority1,
-                narrow(description).c_str());
+    std::printf("%ls priority1=%lu userDescription=%ls\n", name, priority1,
+                description != nullptr ? description : L"");
     SysFreeString(description);
+    SysFreeString(name);
     if (bag != nullptr) {
         bag->Release();
     }
     return read;
-}
-
-bool listAndRead(IkxSysExpert2& expert) {
-    IkxSysEnumStringList* names = nullptr;
-    bool allRead = check(expert.GetItemNames(&names), "GetItemNames");
-    BSTR name = nullptr;
-    while (allRead && names->Next(1, &name, nullptr) == S_OK) {
-        allRead = printItem(expert, name);
-        SysFreeString(name);
-    }
-    if (names != nullptr) {
-        names->Release();
-    }
-    return allRead;
 }
 
 }  // namespace
@@ -69,14 +47,23 @@ int main(int argc, char** argv) {
     const auto create = reinterpret_cast<createCorbelExpertFunction>(reinterpret_cast<void*>(
         library != nullptr ? GetProcAddress(library, "createCorbelExpert") : nullptr));
     IkxSysExpert2* expert = nullptr;
-    bool worked = create != nullptr && check(create(&expert), "createCorbelExpert");
-    if (worked) {
-        worked = check(expert->Initialize(), "Initialize") && listAndRead(*expert);
-        check(expert->Shutdown(), "Shutdown");
+    IkxSysEnumStringList* names = nullptr;
+    bool worked = create != nullptr && check(create(&expert), "createCorbelExpert") &&
+                  check(expert->Initialize(), "Initialize") &&
+                  check(expert->GetItemNames(&names), "GetItemNames");
+    BSTR name = nullptr;
+    while (worked && names->Next(1, &name, nullptr) == S_OK) {
+        worked = printItem(*expert, name);
+    }
+    if (names != nullptr) {
+        names->Release();
+    }
+    if (expert != nullptr) {
+        expert->Shutdown();
         expert->Release();
     }
     if (library != nullptr) {
         FreeLibrary(library);
     }
-    return worked ? 0 : (std::fprintf(stderr, "qv_windows_host: failed\n"), 1);
+    return worked ? 0 : 1;
 }
