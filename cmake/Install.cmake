@@ -1,5 +1,5 @@
 # `cmake --install` puts under the prefix what a host needs: the expert library, the public
-# header, the corbel program, a CMake package (find_package(qv1588) gives the imported
+# header, the corbel program with its manual page and bash completion, a CMake package (find_package(qv1588) gives the imported
 # targets qv1588::qv1588, the library with the header, and qv1588::host_api, the header
 # alone for hosts that load the library with dlopen) and a pkg-config file qv1588.pc.
 include(GNUInstallDirs)
@@ -24,6 +24,10 @@ install(TARGETS qv1588 qv_host_api EXPORT qv1588Targets
 install(DIRECTORY ${PROJECT_SOURCE_DIR}/expert/include/qv1588
         DESTINATION ${CMAKE_INSTALL_INCLUDEDIR})
 install(TARGETS corbel RUNTIME DESTINATION ${CMAKE_INSTALL_BINDIR})
+# corbel's manual page and its bash completion (loaded by bash-completion on demand).
+install(FILES ${PROJECT_SOURCE_DIR}/corbel/cli/corbel.1 DESTINATION ${CMAKE_INSTALL_MANDIR}/man1)
+install(FILES ${PROJECT_SOURCE_DIR}/corbel/cli/corbel.bash-completion
+        DESTINATION ${CMAKE_INSTALL_DATAROOTDIR}/bash-completion/completions RENAME corbel)
 install(EXPORT qv1588Targets NAMESPACE qv1588:: DESTINATION ${QV_CMAKE_PACKAGE_DIR})
 
 file(WRITE ${CMAKE_CURRENT_BINARY_DIR}/qv1588Config.cmake

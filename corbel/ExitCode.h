@@ -1,7 +1,7 @@
 #ifndef QV_CORBEL_EXITCODE_H
 #define QV_CORBEL_EXITCODE_H
 
-#include <qv1588/corbel.h>
+#include <qv1588/qv1588.h>
 
 #include <string>
 
@@ -17,8 +17,13 @@ enum class ExitCode : int {
     kNoExpert = 5,      // the expert library cannot be loaded or started
 };
 
-// The exit code for a failed result of an item operation.
-ExitCode exitCodeOf(HRESULT result);
+// The exit code of an item operation's result and the kind of failure the expert recorded
+// for it: S_FALSE from a discovery is "nothing found" unless the discovery itself failed.
+ExitCode exitCodeOf(HRESULT result, kxQvFailureKind kind);
+
+// The worse of two outcomes, for a command over several items: a failure outweighs
+// "nothing found", which outweighs success.
+ExitCode worse(ExitCode left, ExitCode right);
 
 // "0x80004005".
 std::string hresultText(HRESULT result);

@@ -2,6 +2,8 @@
 
 #include <charconv>
 #include <cstdio>
+#include <limits>
+#include <type_traits>
 #include <vector>
 
 #include "corbel/ComPtr.h"
@@ -72,31 +74,44 @@ std::optional<PropertyValue> readTag(IkxSysPropertyBag& bag, IkxSysPropertyBag2*
     }
 }
 
-std::string doubleText(double value) {
-    char text[32];
-    const auto end = std::to_chars(text, text + sizeof text, value).ptr;
-    return std::string(text, end);
-}
-
 template <typename Number>
-std::optional<PropertyValue> parseNumber(std::string_view text) {
+ParsedValue parseNumber(std::string_view text) {
     Number number{};
     const char* end = text.data() + text.size();
     const auto parsed = std::from_chars(text.data(), end, number);
-    if (text.empty() || parsed.ec != std::errc() || parsed.ptr != end) {
-        return std::nullopt;
+    if (!text.empty() && parsed.ec == std::errc() && parsed.ptr == end) {
+        return {number, {}};
     }
-    return number;
+    if constexpr (std::is_floating_point_v<Number>) {
+        return {std::nullopt, "takes a number such as 6 or 2.5"};
+    } else {
+        return {std::nullopt, "takes a whole number from " +
+                                  std::to_string(std::numeric_limits<Number>::min()) + " to " +
+                                  std::to_string(std::numeric_limits<Number>::max())};
+    }
 }
 
-std::optional<PropertyValue> parseBool(std::string_view text) {
+ParsedValue parseBool(std::string_view text) {
     if (text == "true" || text == "1") {
-        return true;
+        return {true, {}};
     }
     if (text == "false" || text == "0") {
-        return false;
+        return {false, {}};
     }
-    return std::nullopt;
+    return {std::nullopt, "takes true, false, 1 or 0"};
+}
+
+ParsedValue parseTime(std::string_view text) {
+    const UtcParse parsed = parseUtc(text);
+    switch (parsed.error) {
+        case UtcError::kNone:
+            return {*parsed.time, {}};
+        case UtcError::kOutOfRange:
+            return {std::nullopt, "takes a time from " + firstPtpTime() + " to " + lastPtpTime() +
+                                      ", the times that PTP carries"};
+        default:
+            return {std::nullopt, "takes a UTC time such as 2026-12-06T20:15:00Z"};
+    }
 }
 
 }  // namespace
@@ -122,36 +137,7 @@ std::string guidText(const GUID& guid) {
     return text;
 }
 
-std::string toText(const PropertyValue& value) {
-    struct Text {
-        std::string operator()(bool flag) const { return flag ? "true" : "false"; }
-        std::string operator()(std::int32_t number) const { return std::to_string(number); }
-        std::string operator()(std::uint32_t number) const { return std::to_string(number); }
-        std::string operator()(double number) const { return doubleText(number); }
-        std::string operator()(const GUID& guid) const { return guidText(guid); }
-        std::string operator()(const std::string& text) const { return '"' + text + '"'; }
-        std::string operator()(const kxSysAttrTimestampUTC& time) const { return formatUtc(time); }
-    };
-    return std::visit(Text{}, value);
-}
-
-nlohmann::json toJson(const PropertyValue& value) {
-    struct Json {
-        nlohmann::json operator()(const GUID& guid) const { return guidText(guid); }
-        nlohmann::json operator()(const kxSysAttrTimestampUTC& time) const {
-            return {
-                {"seconds", time.seconds}, {"fraction", time.fraction}, {"utc", formatUtc(time)}};
-        }
-        nlohmann::json operator()(bool flag) const { return flag; }
-        nlohmann::json operator()(std::int32_t number) const { return number; }
-        nlohmann::json operator()(std::uint32_t number) const { return number; }
-        nlohmann::json operator()(double number) const { return number; }
-        nlohmann::json operator()(const std::string& text) const { return text; }
-    };
-    return std::visit(Json{}, value);
-}
-
-std::optional<PropertyValue> parseValue(std::string_view text, kxSysPropertyType type) {
+ParsedValue parseValue(std::string_view text, kxSysPropertyType type) {
     switch (type) {
         case kxSysPropertyTypeBool:
             return parseBool(text);
@@ -162,13 +148,11 @@ std::optional<PropertyValue> parseValue(std::string_view text, kxSysPropertyType
         case kxSysPropertyTypeDouble:
             return parseNumber<double>(text);
         case kxSysPropertyTypeString:
-            return std::string(text);
-        case kxSysPropertyTypeTimestamp: {
-            const auto time = parseUtc(text);
-            return time ? std::optional<PropertyValue>(*time) : std::nullopt;
-        }
+            return {std::string(text), {}};
+        case kxSysPropertyTypeTimestamp:
+            return parseTime(text);
         default:
-            return std::nullopt;
+            return {std::nullopt, "cannot be given as text"};
     }
 }
 

@@ -5,7 +5,6 @@
 
 #include <cstdint>
 #include <map>
-#include <nlohmann/json.hpp>
 #include <optional>
 #include <string>
 #include <string_view>
@@ -27,14 +26,21 @@ PropertyValues readBag(IkxSysPropertyBag& bag);
 // "{7B913AC1-977C-404B-9313-1778C1DCA6BA}".
 std::string guidText(const GUID& guid);
 
-// The value as a table shows it.
-std::string toText(const PropertyValue& value);
-// The value in JSON: number, bool or string; a timestamp as {"seconds", "fraction", "utc"}.
-nlohmann::json toJson(const PropertyValue& value);
+// The value's type code (kxSysPropertyTypeBool ...).
+inline ULONG typeOf(const PropertyValue& value) {
+    return static_cast<ULONG>(value.index() + 1);
+}
 
-// A value of `type` from the command line: integers, doubles, "true"/"false"/"1"/"0",
-// strings, ISO 8601 UTC times; nothing when the text is not a value of that type.
-std::optional<PropertyValue> parseValue(std::string_view text, kxSysPropertyType type);
+// A value read from text, or what a value of that type looks like ("takes true, false, 1
+// or 0").
+struct ParsedValue {
+    std::optional<PropertyValue> value;
+    std::string expected;
+};
+
+// A value of `type` from text as a user types it: integers, doubles, "true"/"false"/"1"/
+// "0", strings, ISO 8601 UTC times within what PTP carries.
+ParsedValue parseValue(std::string_view text, kxSysPropertyType type);
 
 // Stores `value` under `tag` with the setter of its type.
 HRESULT storeValue(IkxSysPropertyBag2& bag, kxSysAttributeTagID tag, const PropertyValue& value);

@@ -20,6 +20,26 @@ std::span<const TagInfo> allTags() {
     return kxQvAttributes;
 }
 
+std::size_t catalogOrder(kxSysAttributeTagID tag) {
+    const TagInfo* info = findTag(tag);
+    return info != nullptr ? static_cast<std::size_t>(info - std::begin(kxQvAttributes))
+                           : std::size(kxQvAttributes) + tag;
+}
+
+std::vector<const TagInfo*> tagsInOrder() {
+    std::vector<const TagInfo*> tags;
+    for (const TagInfo& info : kxQvAttributes) {
+        tags.push_back(&info);
+    }
+    std::ranges::sort(tags, {}, &TagInfo::tag);
+    return tags;
+}
+
+std::string tagName(kxSysAttributeTagID tag) {
+    const TagInfo* info = findTag(tag);
+    return info != nullptr ? info->name : tagText(tag);
+}
+
 const TagInfo* findTag(kxSysAttributeTagID tag) {
     return kxQvFindAttribute(tag);
 }

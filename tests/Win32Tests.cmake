@@ -25,6 +25,13 @@ file(GLOB QV_PTPMGMT_TESTS CONFIGURE_DEPENDS ${CMAKE_CURRENT_SOURCE_DIR}/ptpmgmt
 qv_add_unit_tests(qv_ptpmgmt_tests SOURCES ${QV_PTPMGMT_TESTS}
                   LIBS qv_ptpmgmt qv_test_support_ptpmgmt)
 
+# corbel's host pieces: words, units, times, JSON and exit codes (the command-line answers
+# are checked by running the POSIX program).
+if(TARGET corbel_host)
+  qv_add_unit_tests(qv_corbel_tests SOURCES corbel/ValueTextTest.cpp corbel/UtcTimeTest.cpp
+                    corbel/OutcomeTest.cpp LIBS corbel_host)
+endif()
+
 # A Windows host as one is written for the platform: <windows.h> before the public headers,
 # none of the project's definitions (all of windows.h, with its min and max), the oldest
 # standard the headers allow, every warning an error. tools/build-windows runs it against
