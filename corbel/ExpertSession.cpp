@@ -70,10 +70,7 @@ bool ExpertSession::initialize() {
     const HRESULT result = expert_->Initialize();
     initialized_ = SUCCEEDED(result);
     if (!initialized_) {
-        failure_ =
-            "the expert cannot open the PTP ports (UDP 319 and 320 need root or "
-            "CAP_NET_BIND_SERVICE; " +
-            hresultText(result) + ")";
+        failure_ = "the expert cannot open the PTP ports";
     }
     return initialized_;
 }
