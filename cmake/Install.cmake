@@ -10,6 +10,9 @@ if(NOT TARGET qv1588)
 endif()
 
 set(QV_CMAKE_PACKAGE_DIR ${CMAKE_INSTALL_LIBDIR}/cmake/qv1588)
+# Installed programs and libraries carry no debug information, also with a plain
+# `cmake --install` (the build tree keeps it): the same as `cmake --install --strip`.
+install(CODE "set(CMAKE_INSTALL_DO_STRIP TRUE)")
 # Installed, the header is found under the prefix instead of the source tree.
 set_target_properties(qv_host_api PROPERTIES
   EXPORT_NAME host_api

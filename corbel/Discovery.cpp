@@ -13,7 +13,7 @@ std::vector<std::string> namesOf(IkxSysEnumStringList& names) {
     ULONG fetched = 0;
     while (SUCCEEDED(names.Next(16, batch, &fetched)) && fetched > 0) {
         for (ULONG i = 0; i < fetched; ++i) {
-            result.push_back(toUtf8(batch[i] == nullptr ? u"" : batch[i]));
+            result.push_back(toUtf8(batch[i] == nullptr ? OLESTR("") : batch[i]));
             SysFreeString(batch[i]);
         }
         fetched = 0;

@@ -19,7 +19,12 @@ std::vector<std::string> defaultCandidates() {
                                  .string());
     }
 #ifdef QV_CORBEL_EXPERT_BUILT
-    candidates.emplace_back(QV_CORBEL_EXPERT_BUILT);
+    // The build tree's library, for the program in the build tree only: an installed copy
+    // never names it.
+    std::error_code error;
+    if (!folder.empty() && std::filesystem::equivalent(folder, QV_CORBEL_BUILD_FOLDER, error)) {
+        candidates.emplace_back(QV_CORBEL_EXPERT_BUILT);
+    }
 #endif
     return candidates;
 }
@@ -65,10 +70,7 @@ bool ExpertSession::initialize() {
     const HRESULT result = expert_->Initialize();
     initialized_ = SUCCEEDED(result);
     if (!initialized_) {
-        failure_ =
-            "the expert cannot open the PTP ports (UDP 319 and 320 need root or "
-            "CAP_NET_BIND_SERVICE; " +
-            hresultText(result) + ")";
+        failure_ = "the expert cannot open the PTP ports";
     }
     return initialized_;
 }

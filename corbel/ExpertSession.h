@@ -12,8 +12,8 @@ namespace corbel {
 // gives back its reference and unloads the library, in that order.
 class ExpertSession {
   public:
-    // `libraryPath` empty: the library installed beside this program, else the one built
-    // beside it.
+    // `libraryPath` empty: the library installed beside this program, else (for the program
+    // in the build tree) the one built beside it.
     explicit ExpertSession(const std::string& libraryPath);
     ~ExpertSession();
     ExpertSession(const ExpertSession&) = delete;

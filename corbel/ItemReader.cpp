@@ -49,7 +49,7 @@ std::vector<kxSysAttributeTagID> ItemReading::tagsInOrder() const {
 ItemReading ItemReader::read(const std::string& item,
                              const std::vector<kxSysAttributeTagID>& wanted, bool withBase) const {
     ItemReading reading{item, std::nullopt, {}, {}};
-    const std::u16string name = toUtf16(item);
+    const auto name = toUtf16(item);
     ComPtr<IkxSysPropertyBag> base;
     const HRESULT found = expert_.GetItem(name.c_str(), base.out());
     if (FAILED(found) || !base) {

@@ -29,10 +29,12 @@ std::vector<kxSysAttributeTagID> tagsOf(IkxSysPropertyBag& bag) {
     return tags;
 }
 
-template <typename Value, typename Getter>
+// `Out` is the getter's own type (LONG and ULONG are long on Windows), `Value` the variant's.
+template <typename Value, typename Out = Value, typename Getter>
 std::optional<PropertyValue> get(Getter getter) {
-    Value value{};
-    return SUCCEEDED(getter(&value)) ? std::optional<PropertyValue>(value) : std::nullopt;
+    Out value{};
+    return SUCCEEDED(getter(&value)) ? std::optional<PropertyValue>(static_cast<Value>(value))
+                                     : std::nullopt;
 }
 
 std::optional<PropertyValue> readTag(IkxSysPropertyBag& bag, IkxSysPropertyBag2* bag2,
@@ -48,9 +50,9 @@ std::optional<PropertyValue> readTag(IkxSysPropertyBag& bag, IkxSysPropertyBag2*
                                                       : std::nullopt;
         }
         case kxSysPropertyTypeLong:
-            return get<std::int32_t>([&](LONG* out) { return bag.GetLong(tag, out); });
+            return get<std::int32_t, LONG>([&](LONG* out) { return bag.GetLong(tag, out); });
         case kxSysPropertyTypeULong:
-            return get<std::uint32_t>([&](ULONG* out) { return bag.GetULong(tag, out); });
+            return get<std::uint32_t, ULONG>([&](ULONG* out) { return bag.GetULong(tag, out); });
         case kxSysPropertyTypeDouble:
             return get<double>([&](double* out) { return bag.GetDouble(tag, out); });
         case kxSysPropertyTypeGUID:
@@ -129,8 +131,9 @@ PropertyValues readBag(IkxSysPropertyBag& bag) {
 std::string guidText(const GUID& guid) {
     char text[40];
     std::snprintf(text, sizeof text, "{%08X-%04X-%04X-%02X%02X-%02X%02X%02X%02X%02X%02X}",
-                  guid.Data1, guid.Data2, guid.Data3, guid.Data4[0], guid.Data4[1], guid.Data4[2],
-                  guid.Data4[3], guid.Data4[4], guid.Data4[5], guid.Data4[6], guid.Data4[7]);
+                  static_cast<unsigned>(guid.Data1), guid.Data2, guid.Data3, guid.Data4[0],
+                  guid.Data4[1], guid.Data4[2], guid.Data4[3], guid.Data4[4], guid.Data4[5],
+                  guid.Data4[6], guid.Data4[7]);
     return text;
 }
 

@@ -58,10 +58,11 @@ nlohmann::ordered_json entryJson(kxSysAttributeTagID tag, const PropertyValue& v
 
 nlohmann::ordered_json unreadJson(kxSysAttributeTagID tag, const FailureCause& cause) {
     const TagInfo* info = findTag(tag);
-    nlohmann::ordered_json entry = {{"tag", tagText(tag)},
-                                    {"type", typeName(info != nullptr ? info->type : 0u)},
-                                    {"settable", info != nullptr && info->settable},
-                                    {"value", nullptr}};
+    nlohmann::ordered_json entry = {
+        {"tag", tagText(tag)},
+        {"type", typeName(info != nullptr ? static_cast<ULONG>(info->type) : ULONG{0})},
+        {"settable", info != nullptr && info->settable},
+        {"value", nullptr}};
     entry.update(causeJson(cause));
     return entry;
 }

@@ -51,25 +51,25 @@ void appendUtf8(std::string& out, char32_t point) {
 
 }  // namespace
 
-std::u16string toUtf16(std::string_view text) {
-    std::u16string wide;
+std::basic_string<OLECHAR> toUtf16(std::string_view text) {
+    std::basic_string<OLECHAR> wide;
     std::size_t at = 0;
     while (at < text.size()) {
         const char32_t point = nextFromUtf8(text, at);
         if (point < 0x10000) {
-            wide.push_back(static_cast<char16_t>(point));
+            wide.push_back(static_cast<OLECHAR>(point));
         } else {
-            wide.push_back(static_cast<char16_t>(0xD800 + ((point - 0x10000) >> 10)));
-            wide.push_back(static_cast<char16_t>(0xDC00 + ((point - 0x10000) & 0x3FF)));
+            wide.push_back(static_cast<OLECHAR>(0xD800 + ((point - 0x10000) >> 10)));
+            wide.push_back(static_cast<OLECHAR>(0xDC00 + ((point - 0x10000) & 0x3FF)));
         }
     }
     return wide;
 }
 
-std::string toUtf8(std::u16string_view text) {
+std::string toUtf8(std::basic_string_view<OLECHAR> text) {
     std::string narrow;
     for (std::size_t at = 0; at < text.size(); ++at) {
-        const char16_t unit = text[at];
+        const OLECHAR unit = text[at];
         char32_t point = unit;
         if (unit >= 0xD800 && unit <= 0xDBFF && at + 1 < text.size() && text[at + 1] >= 0xDC00 &&
             text[at + 1] <= 0xDFFF) {

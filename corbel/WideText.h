@@ -8,10 +8,11 @@
 
 namespace corbel {
 
-// The boundary speaks UTF-16, the terminal and JSON UTF-8. Malformed input in either
-// direction becomes U+FFFD instead of failing: a clock's text must never end a listing.
-std::u16string toUtf16(std::string_view text);
-std::string toUtf8(std::u16string_view text);
+// The boundary speaks UTF-16 in its own character type (OLECHAR: wchar_t on Windows), the
+// terminal and JSON UTF-8. Malformed input in either direction becomes U+FFFD instead of
+// failing: a clock's text must never end a listing.
+std::basic_string<OLECHAR> toUtf16(std::string_view text);
+std::string toUtf8(std::basic_string_view<OLECHAR> text);
 
 // Owns a BSTR that the expert handed out and frees it with SysFreeString.
 class OwnedBstr {

@@ -8,7 +8,7 @@ using qv::dsc::BStr;
 
 CqvBStr CqvBStr::copyOf(const OLECHAR* text) {
     CqvBStr result;
-    result.text_ = BStr::allocate(text);
+    result.text_ = BStr::copy(text);
     return result;
 }
 
@@ -26,5 +26,5 @@ CqvBStr::~CqvBStr() {
 }
 
 BSTR CqvBStr::copy() const {
-    return text_ == nullptr ? nullptr : BStr::allocate(text_, BStr::length(text_));
+    return text_ == nullptr ? nullptr : BStr::copy(text_, BStr::length(text_));
 }

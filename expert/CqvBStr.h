@@ -1,7 +1,13 @@
 #ifndef QV_EXPERT_CQVBSTR_H
 #define QV_EXPERT_CQVBSTR_H
 
+#include <type_traits>
+
+#include "platform/BStr.h"
 #include "qv1588/corbel.h"
+
+// The library's boundary strings are the header's: one character type, one allocator.
+static_assert(std::is_same_v<OLECHAR, qv::dsc::OleChar> && std::is_same_v<BSTR, qv::dsc::BSTR>);
 
 // An owned BSTR, freed with the object; null is the empty text. Copies allocate (and throw
 // std::bad_alloc when memory runs out); moves hand the string over.

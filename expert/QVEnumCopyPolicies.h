@@ -5,7 +5,6 @@
 #include <utility>
 
 #include "platform/BStr.h"
-#include "platform/NumericCast.h"
 #include "qv1588/corbel.h"
 
 // How an enumerator hands one container element to its caller (`copy`, which may throw)
@@ -24,9 +23,7 @@ struct QVCopyTagPolicy {
 
 // Names are delivered as new BSTRs that the caller frees.
 struct QVCopyNamePolicy {
-    static void copy(BSTR* to, const std::u16string& from) {
-        *to = qv::dsc::BStr::allocate(from.data(), qv::dsc::NumericCast::toU32(from.size()));
-    }
+    static void copy(BSTR* to, const std::u16string& from) { *to = qv::dsc::BStr::allocate(from); }
     static void destroy(BSTR* name) noexcept {
         qv::dsc::BStr::release(*name);
         *name = nullptr;

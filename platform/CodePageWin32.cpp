@@ -4,6 +4,7 @@
 
 #include "platform/CodePage.h"
 #include "platform/InvalidLocale.h"
+#include "platform/OleText.h"
 #include "platform/WinError.h"
 
 namespace qv::dsc {
@@ -12,10 +13,6 @@ namespace qv::dsc {
 // code page (CP_ACP).
 
 namespace {
-
-const wchar_t* systemText(std::u16string_view text) {
-    return reinterpret_cast<const wchar_t*>(text.data());
-}
 
 int countOf(std::size_t size, const char* source, std::uint32_t line) {
     if (size > static_cast<std::size_t>(INT_MAX)) {
@@ -77,14 +74,12 @@ bool appendStrict(std::u16string& out, std::string_view text, UINT codePage) {
     if (size <= 0) {
         return false;
     }
-    const std::size_t start = out.size();
-    out.resize(start + static_cast<std::size_t>(size));
-    auto* target = reinterpret_cast<wchar_t*>(out.data() + start);
-    if (MultiByteToWideChar(codePage, MB_ERR_INVALID_CHARS, text.data(), count, target, size) !=
-        size) {
-        out.resize(start);
+    std::wstring converted(static_cast<std::size_t>(size), L'\0');
+    if (MultiByteToWideChar(codePage, MB_ERR_INVALID_CHARS, text.data(), count, converted.data(),
+                            size) != size) {
         return false;
     }
+    out += OleText::toLibrary(converted.data(), converted.size());
     return true;
 }
 
@@ -112,18 +107,18 @@ std::string CodePage::wideToAnsi(std::u16string_view text, std::string_view loca
     if (text.empty()) {
         return result;
     }
-    const std::u16string prepared = preparedText(text, codePage);
+    const std::wstring prepared = OleText::toBoundary(preparedText(text, codePage));
     const int count = countOf(prepared.size(), "WideToAnsi", 167);
     // No best fit: a character the set lacks becomes '?', never a look-alike.
     const DWORD flags = codePage == CP_UTF8 ? 0 : WC_NO_BEST_FIT_CHARS;
-    const int size = WideCharToMultiByte(codePage, flags, systemText(prepared), count, nullptr, 0,
-                                         nullptr, nullptr);
+    const int size =
+        WideCharToMultiByte(codePage, flags, prepared.data(), count, nullptr, 0, nullptr, nullptr);
     if (size <= 0) {
         throw osdep::WinError("WideToAnsi", 167);
     }
     result.resize(static_cast<std::size_t>(size));
-    if (WideCharToMultiByte(codePage, flags, systemText(prepared), count, result.data(), size,
-                            nullptr, nullptr) != size) {
+    if (WideCharToMultiByte(codePage, flags, prepared.data(), count, result.data(), size, nullptr,
+                            nullptr) != size) {
         throw osdep::WinError("WideToAnsi", 177);
     }
     return result;

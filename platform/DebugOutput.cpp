@@ -1,5 +1,6 @@
 #include "platform/DebugOutput.h"
 
+#include <atomic>
 #include <cstdio>
 #include <cstdlib>
 #include <cstring>
@@ -32,6 +33,8 @@ class tEnvironmentOutput {
     tEnvironmentOutput(const tEnvironmentOutput&) = delete;
     tEnvironmentOutput& operator=(const tEnvironmentOutput&) = delete;
 
+    bool isOpen() const { return stream_ != nullptr; }
+
     void write(const char* text) {
         if (stream_ != nullptr) {
             std::fputs(text, stream_);
@@ -54,6 +57,15 @@ tDebugOutputTarget& installedTarget() {  // guarded by outputLock()
     return target;
 }
 
+// Whether installedTarget() has a sink, for readers that take no lock.
+std::atomic<bool> sinkInstalled{false};
+
+// Opened on first use; its stream is written under outputLock().
+tEnvironmentOutput& environmentOutput() {
+    static tEnvironmentOutput output;
+    return output;
+}
+
 }  // namespace
 
 void outputDebugString(const char* text) {
@@ -63,14 +75,18 @@ void outputDebugString(const char* text) {
         target.sink(text, target.context);
         return;
     }
-    static tEnvironmentOutput environmentOutput;
-    environmentOutput.write(text);
+    environmentOutput().write(text);
+}
+
+bool debugOutputListens() {
+    return sinkInstalled.load() || environmentOutput().isOpen();
 }
 
 tDebugOutputTarget setDebugOutputSink(tDebugOutputTarget target) {
     std::lock_guard<std::mutex> guard(outputLock());
     tDebugOutputTarget previous = installedTarget();
     installedTarget() = target;
+    sinkInstalled.store(target.sink != nullptr);
     return previous;
 }
 

@@ -11,6 +11,11 @@ using tDebugOutputSink = void (*)(const char* text, void* context);
 
 void outputDebugString(const char* text);
 
+// Whether a line written now would reach anyone: a sink is installed or QV_TRACE names a
+// destination. On Windows always: a debugger or a monitor may take the debugger output at
+// any time. Cheap, so that a trace can ask before it assembles a line.
+bool debugOutputListens();
+
 // Installs `sink` (null restores the environment's choice) and returns the previous one.
 struct tDebugOutputTarget {
     tDebugOutputSink sink;

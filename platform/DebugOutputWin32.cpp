@@ -33,6 +33,10 @@ void outputDebugString(const char* text) {
     OutputDebugStringA(text);
 }
 
+bool debugOutputListens() {
+    return true;
+}
+
 tDebugOutputTarget setDebugOutputSink(tDebugOutputTarget target) {
     std::lock_guard<std::mutex> guard(outputLock());
     tDebugOutputTarget previous = installedTarget();

@@ -11,10 +11,10 @@ namespace qv::dsc::osdep {
 
 // The interfaces on which discovery sends and listens: the environment variable
 // QV_INTERFACES for one process, else the setting "interfaces" beside "findClocksTimeout"
-// under the key "Software\Quarvel\Corbel\qv-1588" (a file in the SettingsStore folder; on
-// Windows, DiscoveryInterfacesWin32.cpp, a REG_SZ value under HKEY_LOCAL_MACHINE). Either
-// holds interface names separated by commas and/or blanks, or the word "all". Empty or
-// absent: no choice, and the system's default multicast interface serves as before.
+// under the key "Software\Quarvel\Corbel\qv-1588" (OverridableSetting: a file in the
+// SettingsStore folder, on Windows a REG_SZ value under HKEY_LOCAL_MACHINE). Either holds
+// interface names separated by commas and/or blanks, or the word "all". Empty or absent: no
+// choice, and the system's default multicast interface serves as before.
 class DiscoveryInterfaces {
   public:
     static constexpr const char* kKeyPath = "Software\\Quarvel\\Corbel\\qv-1588";
@@ -32,10 +32,6 @@ class DiscoveryInterfaces {
     static std::vector<MulticastInterface> choose(std::string_view setting,
                                                   const std::vector<MulticastInterface>& available,
                                                   std::string& unknown);
-
-  private:
-    // The stored text; empty when the value is absent or unreadable.
-    static std::string readStored();
 };
 
 }  // namespace qv::dsc::osdep

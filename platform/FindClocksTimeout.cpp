@@ -1,12 +1,12 @@
 #include "platform/FindClocksTimeout.h"
 
-#include "platform/SettingsStore.h"
+#include "platform/OverridableSetting.h"
 
 namespace qv::dsc::osdep {
 
 std::uint16_t FindClocksTimeout::read() {
-    const SettingsStore store(kKeyPath);
-    return static_cast<std::uint16_t>(store.readNumber(kValueName).value_or(kDefault) & 0xFFFF);
+    const OverridableSetting setting{kOverrideVariable, kKeyPath, kValueName};
+    return static_cast<std::uint16_t>(setting.readNumber().value_or(kDefault) & 0xFFFF);
 }
 
 }  // namespace qv::dsc::osdep

@@ -5,12 +5,13 @@
 
 namespace qv::dsc::osdep {
 
-// The discovery wait in milliseconds, from the setting "findClocksTimeout" of the key
-// "Software\Quarvel\Corbel\qv-1588" (see SettingsStore); 1000 when it is absent. Only the
-// low 16 bits of the stored number count. On Windows (FindClocksTimeoutWin32.cpp) the
-// setting is the REG_DWORD registry value of that name under HKEY_LOCAL_MACHINE.
+// The discovery wait in milliseconds: the environment variable QV_FIND_CLOCKS_TIMEOUT when
+// it holds a number (this process only), else the setting "findClocksTimeout" of the key
+// "Software\Quarvel\Corbel\qv-1588" (SettingsStore: a file on POSIX, a REG_DWORD value
+// under HKEY_LOCAL_MACHINE on Windows), else 1000. Only the low 16 bits count.
 class FindClocksTimeout {
   public:
+    static constexpr const char* kOverrideVariable = "QV_FIND_CLOCKS_TIMEOUT";
     static constexpr const char* kKeyPath = "Software\\Quarvel\\Corbel\\qv-1588";
     static constexpr const char* kValueName = "findClocksTimeout";
     static constexpr std::uint16_t kDefault = 1000;

@@ -9,6 +9,7 @@
 #include "platform/CodePage.h"
 #include "platform/Exception.h"
 #include "platform/MulticastInterfaces.h"
+#include "platform/OleText.h"
 
 namespace qv::dsc::osdep {
 
@@ -40,10 +41,11 @@ std::vector<std::uint8_t> adapterList() {
     return {};
 }
 
-// In the process's code page, as getenv gives the names to match (see DiscoveryInterfaces).
+// In the process's code page, as the environment gives the names to match (see
+// DiscoveryInterfaces).
 std::string narrowOf(const wchar_t* wide) {
     try {
-        return CodePage::wideToAnsi(reinterpret_cast<const char16_t*>(wide), "");
+        return CodePage::wideToAnsi(OleText::toLibrary(wide), "");
     } catch (const exception::Exception&) {
         return {};  // not valid UTF-16: a name that no one can type
     }

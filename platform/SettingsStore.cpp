@@ -1,9 +1,9 @@
 #include "platform/SettingsStore.h"
 
-#include <charconv>
-#include <cstdlib>
 #include <fstream>
-#include <iterator>
+#include <string>
+
+#include "platform/EnvironmentVariable.h"
 
 namespace qv::dsc::osdep {
 
@@ -16,37 +16,16 @@ bool isSpecialSegment(std::string_view segment) {
     return segment.empty() || segment == "." || segment == "..";
 }
 
-// A decimal or 0x-prefixed hexadecimal number that fits 32 bits, blanks around it allowed.
-std::optional<std::uint32_t> parseNumber(std::string_view text) {
-    const std::size_t first = text.find_first_not_of(" \t\r\n");
-    if (first == text.npos) {
-        return std::nullopt;
-    }
-    text = text.substr(first, text.find_last_not_of(" \t\r\n") - first + 1);
-    int base = 10;
-    if (text.size() > 2 && text[0] == '0' && (text[1] == 'x' || text[1] == 'X')) {
-        base = 16;
-        text.remove_prefix(2);
-    }
-    std::uint32_t value = 0;
-    const auto [end, error] = std::from_chars(text.data(), text.data() + text.size(), value, base);
-    if (error != std::errc() || end != text.data() + text.size()) {
-        return std::nullopt;
-    }
-    return value;
-}
-
 }  // namespace
 
-SettingsStore::SettingsStore(std::string_view keyPath) {
-    const char* root = std::getenv(kRootVariable);
-    folder_ = root != nullptr && *root != '\0' ? root : kDefaultRoot;
+SettingsStore::SettingsStore(std::string_view keyPath)
+    : location_(EnvironmentVariable::read(kRootVariable).value_or(kDefaultRoot)) {
     while (!keyPath.empty()) {
         const std::size_t end = keyPath.find_first_of("\\/");
         const std::string_view segment = keyPath.substr(0, end);
         if (!isSpecialSegment(segment)) {
-            folder_ += '/';
-            folder_ += segment;
+            location_ += '/';
+            location_ += segment;
         }
         keyPath.remove_prefix(end == keyPath.npos ? keyPath.size() : end + 1);
     }
@@ -65,7 +44,7 @@ std::optional<std::string> SettingsStore::readText(std::string_view valueName) c
         valueName.find('\0') != valueName.npos) {
         return std::nullopt;
     }
-    std::ifstream file(folder_ + '/' + std::string(valueName));
+    std::ifstream file(location_ + '/' + std::string(valueName));
     if (!file) {
         return std::nullopt;
     }

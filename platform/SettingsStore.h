@@ -8,10 +8,16 @@
 
 namespace qv::dsc::osdep {
 
-// Persistent settings, one key per folder and one value per file. The key path
+// Persistent settings of the computer, one key of named values.
+//
+// POSIX (SettingsStore.cpp): one key per folder and one value per file. The key path
 // "Software\Quarvel\Corbel\qv-1588" is the folder "<root>/Software/Quarvel/Corbel/qv-1588";
-// the root is $QV_SETTINGS_ROOT when set, otherwise /etc/corbel. A number is stored as
-// decimal text, or hexadecimal after "0x", surrounding white space allowed.
+// the root is $QV_SETTINGS_ROOT when set, otherwise /etc/corbel. A number is stored as text
+// (see parseNumber).
+//
+// Windows (SettingsStoreWin32.cpp): the registry key of that path under HKEY_LOCAL_MACHINE,
+// opened read-only (created when the caller may); a number is a REG_DWORD value, a text a
+// REG_SZ value, given in the process's code page.
 class SettingsStore {
   public:
     static constexpr const char* kRootVariable = "QV_SETTINGS_ROOT";
@@ -28,10 +34,15 @@ class SettingsStore {
     // longer, or named as readNumber never finds.
     std::optional<std::string> readText(std::string_view valueName) const;
 
-    const std::string& folder() const { return folder_; }
+    // Where the values are: the folder on POSIX, the key path on Windows.
+    const std::string& location() const { return location_; }
+
+    // A number as text: decimal, or hexadecimal after "0x", that fits 32 bits, blanks
+    // around it allowed. Shared by the stored files and the environment's overrides.
+    static std::optional<std::uint32_t> parseNumber(std::string_view text);
 
   private:
-    std::string folder_;
+    std::string location_;
 };
 
 }  // namespace qv::dsc::osdep

@@ -14,6 +14,10 @@ void tConsoleTraceDestination::write(const char* text, std::size_t length) {
     outputDebugString(buffer);
 }
 
+bool tConsoleTraceDestination::isAvailable() const {
+    return debugOutputListens();
+}
+
 void tConsoleTraceDestination::write(const char* text) {
     char buffer[kBufferSize];
     std::snprintf(buffer, sizeof(buffer), "%s", text);

@@ -12,6 +12,8 @@ class tConsoleTraceDestination final : public iTraceDestination {
 
     void write(const char* text, std::size_t length) override;
     void write(const char* text) override;
+    // Whether the debug output goes anywhere (debugOutputListens).
+    bool isAvailable() const override;
 };
 
 }  // namespace nQVTARN000

@@ -6,6 +6,7 @@
 #include <cstdarg>
 #include <cstdio>
 #include <cstring>
+#include <new>
 
 #include "platform/CurrentThread.h"
 #include "platform/tStatus.h"
@@ -24,46 +25,94 @@ tTrace::tTrace(iTraceDestination* destination)
              bit(Flag::showFile) | bit(Flag::indent) | bit(Flag::limitHeader)) {}
 
 tTrace::~tTrace() {
-    flags_ &= ~bit(Flag::enabled);
+    flags_.fetch_and(~bit(Flag::enabled));
     for (; linesHeld_ > 0; --linesHeld_) {
         lock_.unlock();
     }
 }
 
 tTrace& tTrace::setFlag(Flag flag, bool enable) {
-    flags_ = enable ? (flags_ | bit(flag)) : (flags_ & ~bit(flag));
+    if (enable) {
+        flags_.fetch_or(bit(flag));
+    } else {
+        flags_.fetch_and(~bit(flag));
+    }
     return *this;
 }
 
 tTrace& tTrace::setHeaderWidth(std::uint32_t width) {
-    headerWidth_ = width;
+    headerWidth_.store(width);
     return *this;
+}
+
+bool tTrace::listening() const {
+    return on(Flag::enabled) && destination_ != nullptr && destination_->isAvailable();
+}
+
+tTrace::tLine* tTrace::threadLine() {
+    if (!listening()) {
+        return nullptr;
+    }
+    try {
+        std::lock_guard<std::mutex> guard(linesLock_);
+        return &lines_[std::this_thread::get_id()];
+    } catch (const std::bad_alloc&) {
+        return nullptr;  // a diagnostic line is not worth a failure of its caller
+    }
+}
+
+tTrace::tLine* tTrace::appendingLine() {
+    tLine* line = threadLine();
+    return line != nullptr && !line->suppressed ? line : nullptr;
+}
+
+void tTrace::forgetIfIdle(const tLine& line) {
+    if (line.text.empty() && !line.suppressed && line.depth == 0) {
+        std::lock_guard<std::mutex> guard(linesLock_);
+        lines_.erase(std::this_thread::get_id());
+    }
 }
 
 tTrace& tTrace::suppress() {
-    suppressed_ = true;
+    if (tLine* line = threadLine()) {
+        line->suppressed = true;
+    }
     return *this;
 }
 
-void tTrace::flushPiece() {
-    line_[cursor_] = '\0';
-    if (destination_ != nullptr) {
-        destination_->write(line_);
+// Whole lines out, each in pieces of at most kMaxPiece characters: a line is never split
+// between two deliveries.
+void tTrace::deliver(std::string_view lines) {
+    char piece[kMaxPiece + 1];
+    std::lock_guard<std::mutex> guard(deliveryLock_);
+    while (!lines.empty()) {
+        const std::size_t size = std::min(lines.find('\n') + 1, kMaxPiece);
+        std::memcpy(piece, lines.data(), size);
+        piece[size] = '\0';
+        destination_->write(piece);
+        lines.remove_prefix(size);
     }
-    cursor_ = 0;
 }
 
-void tTrace::put(char c) {
-    line_[cursor_++] = c;
-    if (c == '\n' || cursor_ == kMaxPiece) {
-        flushPiece();
+void tTrace::put(tLine& line, const char* text, std::size_t length) {
+    try {
+        line.text.append(text, length);
+    } catch (const std::bad_alloc&) {
+        line.text.clear();
+        line.suppressed = true;  // the rest of this line is lost, not the caller's work
+        return;
+    }
+    const std::size_t end = line.text.rfind('\n');
+    if (end != std::string::npos) {
+        deliver(std::string_view(line.text).substr(0, end + 1));
+        line.text.erase(0, end + 1);
     }
 }
 
 tTrace& tTrace::append(const char* text, std::size_t length) {
-    if (appending() && text != nullptr) {
-        for (std::size_t i = 0; i < length; ++i) {
-            put(text[i]);
+    if (text != nullptr && length != 0) {
+        if (tLine* line = appendingLine()) {
+            put(*line, text, length);
         }
     }
     return *this;
@@ -83,6 +132,9 @@ tTrace& tTrace::append(bool value) {
 
 template <typename Integer>
 void tTrace::appendNumber(Integer value, unsigned radix) {
+    if (appendingLine() == nullptr) {
+        return;
+    }
     char digits[34];  // 32 binary digits and a sign
     const int base = radix < 2 || radix > 36 ? 10 : static_cast<int>(radix);
     const std::to_chars_result end = std::to_chars(digits, digits + sizeof digits, value, base);
@@ -111,14 +163,14 @@ tTrace& tTrace::append(std::int32_t value, unsigned radix) {
 }
 
 tTrace& tTrace::append(const iTraceable& object) {
-    if (appending()) {
+    if (appendingLine() != nullptr) {
         object.trace(*this);
     }
     return *this;
 }
 
 tTrace& tTrace::appendFormatted(const char* format, ...) {
-    if (!appending()) {
+    if (appendingLine() == nullptr) {
         return *this;
     }
     char buffer[kMaxTraceLine];
@@ -136,9 +188,10 @@ tTrace& tTrace::appendFormatted(const char* format, ...) {
 }
 
 tTrace& tTrace::endLine() {
-    if (on(Flag::enabled)) {
-        suppressed_ = false;
-        append('\n');
+    if (tLine* line = threadLine()) {
+        line->suppressed = false;
+        put(*line, "\n", 1);
+        forgetIfIdle(*line);
     }
     // Only the thread that locked the line may end its hold.
     if (owner_.load() == std::this_thread::get_id() && linesHeld_ > 0) {
@@ -190,7 +243,8 @@ void tTrace::writeHeader(const char* component, std::uint32_t line, const char* 
         std::snprintf(number, sizeof(number), "%d", code);
         field(number);
     }
-    const std::size_t width = headerWidth_ == 0 ? 0 : headerWidth_ - 1;
+    const std::uint32_t headerWidth = headerWidth_.load();
+    const std::size_t width = headerWidth == 0 ? 0 : headerWidth - 1;
     if (on(Flag::limitHeader) && length > width) {
         length = width;
     }
@@ -198,7 +252,7 @@ void tTrace::writeHeader(const char* component, std::uint32_t line, const char* 
     for (std::size_t i = length; i < width; ++i) {
         append(anyField ? '-' : ' ');
     }
-    if (anyField && !(on(Flag::limitHeader) && headerWidth_ == 0)) {
+    if (anyField && !(on(Flag::limitHeader) && headerWidth == 0)) {
         append("] ");
     }
 }
@@ -213,17 +267,21 @@ tTrace& tTrace::beginLine(const char* component, std::uint32_t line, const char*
         owner_.store(std::this_thread::get_id());
         ++linesHeld_;
     }
+    tLine* current = threadLine();
+    if (current == nullptr) {
+        return *this;  // nobody listens: no header, no nesting to keep
+    }
     writeHeader(component, line, file, code);
-    if (nesting == kCloseLevel && depth_ > 0) {
-        --depth_;
+    if (nesting == kCloseLevel && current->depth > 0) {
+        --current->depth;
     }
     if (on(Flag::indent)) {
-        for (std::int32_t i = 0; i < depth_; ++i) {
+        for (std::int32_t i = 0; i < current->depth; ++i) {
             append("  ");
         }
     }
     if (nesting == kOpenLevel) {
-        ++depth_;
+        ++current->depth;
     }
     return *this;
 }

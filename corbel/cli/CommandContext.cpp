@@ -89,8 +89,12 @@ bool CommandContext::open(bool network, ExitCode& failed) {
         output_.error("no-expert", session_->failure());
     } else if (network && !session_->initialize()) {
         const FailureCause cause = FailureCause::last(expert(), E_FAIL);
-        output_.error("no-expert", session_->failure() +
-                                       (cause.description.empty() ? "" : ": " + cause.description));
+        // The expert names the call that failed; only a refused bind is about privileges.
+        const bool bind = cause.description.find("bind to UDP port") != std::string::npos;
+        output_.error(
+            "no-expert",
+            session_->failure() + (cause.description.empty() ? "" : ": " + cause.description) +
+                (bind ? " (UDP ports 319 and 320 need root or CAP_NET_BIND_SERVICE)" : ""));
     } else {
         return true;
     }

@@ -115,7 +115,7 @@ ExitCode reportOutcome(const CommandContext& context, const std::string& item,
 // The expert checks the changed tags of `bag`, then writes them to the clock.
 ExitCode validateAndApply(const CommandContext& context, const std::string& item,
                           IkxSysPropertyBag2& bag, const std::vector<Change>& changes) {
-    const std::u16string name = toUtf16(item);
+    const auto name = toUtf16(item);
     ComPtr<IkxSysEnumPropertyTag> accepted;
     OwnedBstr message;
     const HRESULT valid =

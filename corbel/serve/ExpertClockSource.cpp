@@ -87,7 +87,7 @@ ClockReading ExpertClockSource::read(const std::string& item,
     return result;
 }
 
-ComPtr<IkxSysPropertyBag2> ExpertClockSource::changeBag(const std::u16string& item,
+ComPtr<IkxSysPropertyBag2> ExpertClockSource::changeBag(const std::basic_string<OLECHAR>& item,
                                                         const std::vector<Setting>& settings,
                                                         FailureCause& failure) const {
     ComPtr<IkxSysPropertyBag> base;
@@ -114,7 +114,7 @@ ComPtr<IkxSysPropertyBag2> ExpertClockSource::changeBag(const std::u16string& it
 WriteOutcome ExpertClockSource::write(const std::string& item,
                                       const std::vector<Setting>& settings) {
     WriteOutcome outcome;
-    const std::u16string name = toUtf16(item);
+    const std::basic_string<OLECHAR> name = toUtf16(item);
     FailureCause failure;
     const auto bag = changeBag(name, settings, failure);
     if (!bag) {
@@ -136,8 +136,8 @@ WriteOutcome ExpertClockSource::write(const std::string& item,
 }
 
 // Each setting is validated alone, so that each sentence belongs to its setting.
-void ExpertClockSource::reject(const std::u16string& item, const std::vector<Setting>& settings,
-                               WriteOutcome& outcome) const {
+void ExpertClockSource::reject(const std::basic_string<OLECHAR>& item,
+                               const std::vector<Setting>& settings, WriteOutcome& outcome) const {
     outcome.result = WriteOutcome::Result::rejected;
     for (const Setting& setting : settings) {
         FailureCause failure;
@@ -151,8 +151,9 @@ void ExpertClockSource::reject(const std::u16string& item, const std::vector<Set
     }
 }
 
-void ExpertClockSource::apply(const std::u16string& item, const std::vector<Setting>& settings,
-                              IkxSysPropertyBag2& bag, WriteOutcome& outcome) const {
+void ExpertClockSource::apply(const std::basic_string<OLECHAR>& item,
+                              const std::vector<Setting>& settings, IkxSysPropertyBag2& bag,
+                              WriteOutcome& outcome) const {
     ULONG ignored = 0;
     const HRESULT applied = expert_.ApplyChanges(item.c_str(), &bag, &ignored);
     const FailureCause cause =

@@ -24,12 +24,12 @@ class ExpertClockSource final : public ClockSource {
   private:
     // The item's own bag with `settings` as its changed tags; empty with `failure` set when
     // the item or a value cannot be had.
-    ComPtr<IkxSysPropertyBag2> changeBag(const std::u16string& item,
+    ComPtr<IkxSysPropertyBag2> changeBag(const std::basic_string<OLECHAR>& item,
                                          const std::vector<Setting>& settings,
                                          FailureCause& failure) const;
-    void reject(const std::u16string& item, const std::vector<Setting>& settings,
+    void reject(const std::basic_string<OLECHAR>& item, const std::vector<Setting>& settings,
                 WriteOutcome& outcome) const;
-    void apply(const std::u16string& item, const std::vector<Setting>& settings,
+    void apply(const std::basic_string<OLECHAR>& item, const std::vector<Setting>& settings,
                IkxSysPropertyBag2& bag, WriteOutcome& outcome) const;
 
     IkxSysExpert2& expert_;

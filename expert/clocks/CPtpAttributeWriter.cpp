@@ -5,6 +5,7 @@
 
 #include "expert/CQVComPtr.h"
 #include "expert/clocks/CPtpValueFormat.h"
+#include "platform/BStr.h"
 
 namespace {
 
@@ -172,9 +173,9 @@ std::optional<tChangedValue> readChanged(IkxSysPropertyBag& bag, kxSysAttributeT
             BSTR text = nullptr;
             result = bag.GetString(tag, &text);
             if (SUCCEEDED(result) && text != nullptr) {
-                value.text.assign(text, SysStringLen(text));
+                value.text = qv::dsc::OleText::toLibrary(text, qv::dsc::BStr::length(text));
             }
-            SysFreeString(text);
+            qv::dsc::BStr::release(text);
             break;
         }
         case kxSysPropertyTypeTimestamp: {

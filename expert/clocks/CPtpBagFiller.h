@@ -3,6 +3,7 @@
 
 #include <string>
 
+#include "platform/OleText.h"
 #include "qv1588/corbel.h"
 
 // Sets values into a bag and keeps the first failure, so that a reader sets a whole group
@@ -24,7 +25,7 @@ class CPtpBagFiller {
         return keep(bag_.SetDouble(tag, value));
     }
     CPtpBagFiller& setString(kxSysAttributeTagID tag, const std::u16string& value) {
-        return keep(bag_.SetString(tag, value.c_str()));
+        return keep(bag_.SetString(tag, qv::dsc::OleText::toBoundary(value).c_str()));
     }
     CPtpBagFiller& setTimestamp(kxSysAttributeTagID tag, const kxSysAttrTimestampUTC& value) {
         return keep(bag_.SetTimestamp(tag, &value));

@@ -44,7 +44,7 @@ HRESULT createBag(CQVComPtr<IkxSysPropertyBag2>& bag) {
 }
 
 std::u16string textOf(const OLECHAR* name) {
-    return name == nullptr ? std::u16string() : std::u16string(name);
+    return qv::dsc::OleText::toLibrary(name);
 }
 
 }  // namespace

@@ -46,7 +46,7 @@ const std::pair<Access, Access> kTypes[] = {  // setter, getter; in type order 1
     {[](Bag& b, Tag t) { return b.SetULong(t, 3); }, [](Bag& b, Tag t) { ULONG v; return b.GetULong(t, &v); }},
     {[](Bag& b, Tag t) { return b.SetDouble(t, 0.5); }, [](Bag& b, Tag t) { double v; return b.GetDouble(t, &v); }},
     {[](Bag& b, Tag t) { return b.SetGUID(t, &kGuid); }, [](Bag& b, Tag t) { GUID v; return b.GetGUID(t, &v); }},
-    {[](Bag& b, Tag t) { return b.SetString(t, u"c"); },
+    {[](Bag& b, Tag t) { return b.SetString(t, OLESTR("c")); },
      [](Bag& b, Tag t) { BSTR v = nullptr; const HRESULT r = b.GetString(t, &v); SysFreeString(v); return r; }},
     {[](Bag& b, Tag t) { return b.SetTimestamp(t, &kStamp); },
      [](Bag& b, Tag t) { kxSysAttrTimestampUTC v; return b.GetTimestamp(t, &v); }},
@@ -105,8 +105,14 @@ TEST(CkxDynamicPropertyBagTest, ChangedTagsAscendOutliveRemovalAndClearOnlyOnReq
 }
 
 TEST(CkxDynamicPropertyBagTest, DateTimesConvertThroughLocalTimeFrom1970On) {
-    setenv("TZ", "UTC0", 1);  // this program's tests all run in UTC
+    // This program's tests all run in UTC; the run-time library reads its own copy of TZ.
+#ifdef _WIN32
+    _putenv_s("TZ", "UTC0");
+    _tzset();
+#else
+    setenv("TZ", "UTC0", 1);
     tzset();
+#endif
     const std::pair<std::vector<LONG>, std::int64_t> cases[] = {
         // fields, seconds since 1904 (0 for the all-zero timestamp)
         {{1903, 12, 31, 23, 59, 59}, 0},     {{1970, 1, 1, 0, 0, 0}, 0},
@@ -130,7 +136,7 @@ TEST(CkxDynamicPropertyBagTest, DateTimesConvertThroughLocalTimeFrom1970On) {
 TEST(CkxDynamicPropertyBagTest, ExhaustedMemoryAnswersOutOfMemoryAndChangesNothing) {
     using Operation = HRESULT (*)(Bag&);
     const Operation operations[] = {
-        [](Bag& b) { return b.SetString(kTag + 1, u"clock"); },
+        [](Bag& b) { return b.SetString(kTag + 1, OLESTR("clock")); },
         [](Bag& b) { return b.EnumerateTags(CQVComPtr<IkxSysEnumPropertyTag>().Receive()); },
         [](Bag& b) { return b.Clone(BagPtr().Receive()); },
     };

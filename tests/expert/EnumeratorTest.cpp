@@ -58,7 +58,10 @@ Names next(IkxSysEnumStringList& names) {
     BSTR delivered[3] = {};
     ULONG fetched = 99;
     const HRESULT result = names.Next(3, delivered, &fetched);
-    const Names out = FAILED(result) ? Names{u"failed"} : Names(delivered, delivered + fetched);
+    Names out = FAILED(result) ? Names{u"failed"} : Names();
+    for (ULONG i = 0; SUCCEEDED(result) && i < fetched; ++i) {
+        out.push_back(qv::dsc::OleText::toLibrary(delivered[i]));
+    }
     for (BSTR name : delivered) {
         qv::dsc::BStr::release(name);
     }

@@ -37,7 +37,9 @@ TEST(HostInterfaceSlotTest, EveryOperationSitsInItsSlot) {
     using E = IkxSysExpert2;
     using S = IkxSysEnumStringList;
     using T = IkxSysEnumPropertyTag;
-    expectSlotsFrom(0, &U::QueryInterface, &U::AddRef, &U::Release);
+    // The cast picks the virtual one: Windows' IUnknown adds a template QueryInterface.
+    expectSlotsFrom(0, static_cast<HRESULT (KXSYS_CALL U::*)(REFIID, void**)>(&U::QueryInterface),
+                    &U::AddRef, &U::Release);
     expectSlotsFrom(3, &B::EnumerateTags, &B::HasTag, &B::GetTagType, &B::RemoveTag,
                     &B::RemoveAllTags, &B::SetBool, &B::SetLong, &B::SetULong, &B::SetDouble,
                     &B::SetGUID, &B::SetString, &B::SetDateTime, &B::GetBool, &B::GetLong,

@@ -6,11 +6,13 @@
 #include <string>
 
 #include "platform/DiscoveryInterfaces.h"
+#include "platform/EnvironmentVariable.h"
 #include "platform/EthernetAdapters.h"
 #include "platform/FindClocksTimeout.h"
 #include "platform/SettingsStore.h"
 
 using qv::dsc::osdep::DiscoveryInterfaces;
+using qv::dsc::osdep::EnvironmentVariable;
 using qv::dsc::osdep::EthernetAdapters;
 using qv::dsc::osdep::FindClocksTimeout;
 using qv::dsc::osdep::SettingsStore;
@@ -27,6 +29,7 @@ class SettingsTest : public ::testing::Test {
     }
     void TearDown() override {
         unsetenv(SettingsStore::kRootVariable);
+        unsetenv(FindClocksTimeout::kOverrideVariable);
         std::filesystem::remove_all(root_);
     }
     void store(const std::string& text, const char* value = "findClocksTimeout") {
@@ -40,19 +43,26 @@ class SettingsTest : public ::testing::Test {
 
 }  // namespace
 
-TEST_F(SettingsTest, StoredNumberIsUsedWithItsLow16Bits) {
-    store("2500\n");
-    EXPECT_EQ(FindClocksTimeout::read(), 2500);
-    store("70000");  // 0x11170
-    EXPECT_EQ(FindClocksTimeout::read(), 0x1170);
-    store(" 0x1F4 ");
-    EXPECT_EQ(FindClocksTimeout::read(), 500);
-}
-
-TEST_F(SettingsTest, TextThatIsNoNumberGivesTheDefault) {
-    for (const char* text : {"", "abc", "12ms", "-5", "4294967296", "0x"}) {
-        store(text);
-        EXPECT_EQ(FindClocksTimeout::read(), 1000) << text;
+// The stored number, or this process's override when it holds a number; low 16 bits.
+TEST_F(SettingsTest, StoredNumberOrTheProcessOverrideGivesTheWait) {
+    const struct {
+        const char* stored;
+        const char* variable;
+        std::uint16_t wait;
+    } cases[] = {
+        {"2500\n", nullptr, 2500},     {"70000", nullptr, 0x1170},
+        {" 0x1F4 ", nullptr, 500},     {"", nullptr, 1000},
+        {"abc", nullptr, 1000},        {"12ms", nullptr, 1000},
+        {"-5", nullptr, 1000},         {"4294967296", nullptr, 1000},
+        {"0x", nullptr, 1000},         {"2500", "300", 300},
+        {"2500", " 0x11170 ", 0x1170}, {"2500", "0", 0},
+        {"2500", "abc", 2500},         {"abc", "", 1000},
+    };
+    for (const auto& c : cases) {
+        store(c.stored);
+        EnvironmentVariable::set(FindClocksTimeout::kOverrideVariable, c.variable);
+        EXPECT_EQ(FindClocksTimeout::read(), c.wait)
+            << c.stored << " / " << (c.variable ? c.variable : "-");
     }
     const SettingsStore key(FindClocksTimeout::kKeyPath);
     EXPECT_FALSE(key.readNumber("../qv-1588/findClocksTimeout").has_value());

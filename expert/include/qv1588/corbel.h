@@ -13,22 +13,32 @@
 // reference that the receiver gives back with Release. AddRef and Release are atomic, so
 // references may be taken and given back on any thread.
 //
-// Strings: the wide character of the boundary is char16_t (UTF-16 code units, the Windows
-// host's wide strings). A BSTR points at the first code unit of a NUL-terminated text whose
-// length in octets is stored in the four octets before it; the expert allocates every BSTR
-// it hands out and the receiver frees it with the expert library's own release
-// (`SysFreeString` on Windows). A null BSTR is an empty text.
+// Strings: a BSTR points at the first UTF-16 code unit of a NUL-terminated text whose length
+// in octets is stored in the four octets before it; a null BSTR is an empty text. The
+// expert allocates every BSTR it hands out and the receiver frees it with SysFreeString.
+//
+// On Windows this header is the platform's own COM: IUnknown from <unknwn.h>, GUID, IID and
+// REFIID, HRESULT and its codes, OLECHAR (wchar_t) and BSTR, and SysAllocString,
+// SysFreeString and SysStringLen from oleaut32, so that a host's interface pointers and
+// strings are the very same types; a host may include <windows.h> before or after it. Every
+// BSTR comes from oleaut32 and goes back to it, on both sides. Elsewhere the header defines
+// the same names itself, with char16_t as OLECHAR and a release of its own that matches
+// the expert library's allocation (the C library's malloc, which both sides share).
 
-#include <cstddef>
 #include <cstdint>
+
+#ifdef _WIN32
+#include <windows.h>
+// After windows.h, which they need.
+#include <oleauto.h>
+#include <unknwn.h>
+
+#define KXSYS_CALL STDMETHODCALLTYPE
+#else
 #include <cstdlib>
 #include <cstring>
 
-#if defined(_WIN32) && !defined(_WIN64)
-#define KXSYS_CALL __stdcall
-#else
 #define KXSYS_CALL
-#endif
 
 using HRESULT = std::int32_t;
 using ULONG = std::uint32_t;
@@ -36,6 +46,8 @@ using LONG = std::int32_t;
 using BOOL = std::int32_t;
 using OLECHAR = char16_t;
 using BSTR = OLECHAR*;
+// A literal of the boundary's wide characters, as on Windows: OLESTR("clock").
+#define OLESTR(text) u##text
 
 struct GUID {
     std::uint32_t Data1;
@@ -44,6 +56,7 @@ struct GUID {
     std::uint8_t Data4[8];
 };
 using IID = GUID;
+using REFIID = const IID&;
 
 inline bool operator==(const GUID& left, const GUID& right) {
     return std::memcmp(&left, &right, sizeof(GUID)) == 0;
@@ -60,13 +73,6 @@ inline constexpr HRESULT E_NOINTERFACE = static_cast<HRESULT>(0x80004002u);
 inline constexpr HRESULT E_POINTER = static_cast<HRESULT>(0x80004003u);
 inline constexpr HRESULT E_FAIL = static_cast<HRESULT>(0x80004005u);
 inline constexpr HRESULT E_OUTOFMEMORY = static_cast<HRESULT>(0x8007000Eu);
-// A tag holds a value of another type.
-inline constexpr HRESULT CORBEL_E_TYPE_MISMATCH = static_cast<HRESULT>(0x80040370u);
-inline constexpr HRESULT CORBEL_E_TAG_NOT_FOUND = static_cast<HRESULT>(0x80040371u);
-// No clock answers to an item name.
-inline constexpr HRESULT CORBEL_E_ITEM_NOT_FOUND = static_cast<HRESULT>(0x80040375u);
-// A changed value failed validation.
-inline constexpr HRESULT CORBEL_E_INVALID_VALUE = static_cast<HRESULT>(0x8004037Fu);
 
 inline constexpr bool SUCCEEDED(HRESULT result) {
     return result >= 0;
@@ -74,6 +80,50 @@ inline constexpr bool SUCCEEDED(HRESULT result) {
 inline constexpr bool FAILED(HRESULT result) {
     return result < 0;
 }
+
+inline constexpr IID IID_IUnknown = {
+    0x00000000, 0x0000, 0x0000, {0xC0, 0x00, 0x00, 0x00, 0x00, 0x00, 0x00, 0x46}};
+
+// Interfaces have no virtual destructor (a host never deletes an interface pointer: it
+// releases it); the destructor is protected so that nobody can.
+struct IUnknown {
+    virtual HRESULT KXSYS_CALL QueryInterface(REFIID iid, void** object) = 0;  // slot 0
+    virtual ULONG KXSYS_CALL AddRef() = 0;                                     // slot 1
+    virtual ULONG KXSYS_CALL Release() = 0;                                    // slot 2
+
+  protected:
+    ~IUnknown() = default;
+};
+
+// Frees a BSTR that the expert handed out: its block starts at the length prefix and comes
+// from the C library's allocator.
+inline void SysFreeString(BSTR text) {
+    if (text != nullptr) {
+        std::free(reinterpret_cast<std::uint8_t*>(text) - sizeof(std::uint32_t));
+    }
+}
+// Code units of a BSTR, from its prefix (a null BSTR is empty).
+inline ULONG SysStringLen(const OLECHAR* text) {
+    std::uint32_t octets = 0;
+    if (text != nullptr) {
+        std::memcpy(&octets, reinterpret_cast<const std::uint8_t*>(text) - sizeof octets,
+                    sizeof octets);
+    }
+    return static_cast<ULONG>(octets / sizeof(OLECHAR));
+}
+#endif
+
+static_assert(sizeof(OLECHAR) == 2, "UTF-16 code units");
+static_assert(sizeof(ULONG) == 4 && sizeof(LONG) == 4 && sizeof(BOOL) == 4);
+
+// The host framework's own result codes.
+// A tag holds a value of another type.
+inline constexpr HRESULT CORBEL_E_TYPE_MISMATCH = static_cast<HRESULT>(0x80040370u);
+inline constexpr HRESULT CORBEL_E_TAG_NOT_FOUND = static_cast<HRESULT>(0x80040371u);
+// No clock answers to an item name.
+inline constexpr HRESULT CORBEL_E_ITEM_NOT_FOUND = static_cast<HRESULT>(0x80040375u);
+// A changed value failed validation.
+inline constexpr HRESULT CORBEL_E_INVALID_VALUE = static_cast<HRESULT>(0x8004037Fu);
 
 // Attribute tags: the expert's own at 0xE001000 to 0xE028000 in steps of 0x1000, the host's
 // general ones at 0x1001000 to 0x1037000.
@@ -100,8 +150,6 @@ enum kxSysPropertyType : ULONG {
 };
 
 // Interface identifiers.
-inline constexpr IID IID_IUnknown = {
-    0x00000000, 0x0000, 0x0000, {0xC0, 0x00, 0x00, 0x00, 0x00, 0x00, 0x00, 0x46}};
 inline constexpr IID IID_IkxSysExpert = {
     0x9C257614, 0x172D, 0x4D5D, {0x81, 0xBB, 0x3D, 0x4F, 0x72, 0xBD, 0x30, 0xA4}};
 inline constexpr IID IID_IkxSysExpert2 = {
@@ -118,16 +166,15 @@ inline constexpr IID IID_IkxSysEnumPropertyTag = {
 inline constexpr GUID CLSID_QvPtpSysExpert = {
     0x7B913AC1, 0x977C, 0x404B, {0x93, 0x13, 0x17, 0x78, 0xC1, 0xDC, 0xA6, 0xBA}};
 
-// Interfaces have no virtual destructor (a host never deletes an interface pointer: it
-// releases it); the destructor is protected so that nobody can.
-struct IUnknown {
-    virtual HRESULT KXSYS_CALL QueryInterface(const IID& iid, void** object) = 0;  // slot 0
-    virtual ULONG KXSYS_CALL AddRef() = 0;                                         // slot 1
-    virtual ULONG KXSYS_CALL Release() = 0;                                        // slot 2
+#if defined(_WIN32) && defined(__GNUC__)
+// The platform's IUnknown leaves its destructor public and non-virtual; each interface
+// below makes its own protected, so that nobody deletes through an interface pointer.
+#pragma GCC diagnostic push
+#pragma GCC diagnostic ignored "-Wnon-virtual-dtor"
+#endif
 
-  protected:
-    ~IUnknown() = default;
-};
+// Every interface below has IUnknown's three operations in slots 0 to 2 and a protected
+// destructor: a host releases an interface pointer, never deletes it.
 
 // Slots 3 to 6 of both enumerators.
 struct IkxSysEnumStringList : IUnknown {
@@ -249,22 +296,9 @@ struct IkxSysExpert2 : IkxSysExpert {
     ~IkxSysExpert2() = default;
 };
 
-// Frees a BSTR that the expert handed out: its block starts at the length prefix and comes
-// from the C library's allocator, which the host and the library share.
-inline void SysFreeString(BSTR text) {
-    if (text != nullptr) {
-        std::free(reinterpret_cast<std::uint8_t*>(text) - sizeof(std::uint32_t));
-    }
-}
-// Code units of a BSTR, from its prefix (a null BSTR is empty).
-inline ULONG SysStringLen(const OLECHAR* text) {
-    std::uint32_t octets = 0;
-    if (text != nullptr) {
-        std::memcpy(&octets, reinterpret_cast<const std::uint8_t*>(text) - sizeof octets,
-                    sizeof octets);
-    }
-    return static_cast<ULONG>(octets / sizeof(OLECHAR));
-}
+#if defined(_WIN32) && defined(__GNUC__)
+#pragma GCC diagnostic pop
+#endif
 
 // The library's one export. The expert answers QueryInterface for IUnknown, IkxSysExpert and
 // IkxSysExpert2 with this same pointer.

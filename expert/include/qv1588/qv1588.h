@@ -184,6 +184,13 @@ inline const kxQvAttribute* kxQvFindAttribute(const char* name) {
     return nullptr;
 }
 
+#if defined(_WIN32) && defined(__GNUC__)
+// The platform's IUnknown leaves its destructor public and non-virtual; each interface
+// below makes its own protected, so that nobody deletes through an interface pointer.
+#pragma GCC diagnostic push
+#pragma GCC diagnostic ignored "-Wnon-virtual-dtor"
+#endif
+
 // The expert's own interface beside its expert interfaces (QueryInterface on the expert):
 // why the last operation of the calling thread failed, in the manner of COM's per-thread
 // error information. Every item operation of the expert clears the calling thread's record
@@ -225,5 +232,9 @@ struct IkxQvLastFailure2 : IkxQvLastFailure {
   protected:
     ~IkxQvLastFailure2() = default;
 };
+
+#if defined(_WIN32) && defined(__GNUC__)
+#pragma GCC diagnostic pop
+#endif
 
 #endif

@@ -6,6 +6,7 @@ namespace qvtest {
 
 std::string textOf(IkxSysPropertyBag& bag, kxSysAttributeTagID tag) {
     ULONG type = 0;
+    BOOL flag = 0;
     LONG number = 0;
     ULONG unsignedNumber = 0;
     double real = 0;
@@ -16,10 +17,10 @@ std::string textOf(IkxSysPropertyBag& bag, kxSysAttributeTagID tag) {
     std::string narrow;
     switch (bag.GetTagType(tag, &type) == S_OK ? type : 0) {
         case kxSysPropertyTypeBool:
+            bag.GetBool(tag, &flag);
+            return std::to_string(flag);
         case kxSysPropertyTypeLong:
-            if (bag.GetLong(tag, &number) != S_OK) {
-                bag.GetBool(tag, &number);
-            }
+            bag.GetLong(tag, &number);
             return std::to_string(number);
         case kxSysPropertyTypeULong:
             bag.GetULong(tag, &unsignedNumber);

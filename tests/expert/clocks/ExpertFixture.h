@@ -5,8 +5,6 @@
 #include <stdlib.h>
 
 #include <cstdint>
-#include <filesystem>
-#include <fstream>
 #include <string>
 #include <tuple>
 #include <vector>
@@ -15,6 +13,9 @@
 #include "expert/CQVComPtr.h"
 #include "expert/CkxDynamicPropertyBag.h"
 #include "expert/clocks/CPtpSysExpert.h"
+#include "platform/EnvironmentVariable.h"
+#include "platform/FindClocksTimeout.h"
+#include "platform/OleText.h"
 #include "ptp/tManagementMessagePayload.h"
 #include "tests/expert/clocks/BagText.h"
 #include "tests/support/ptpmgmt/SimulatedNetwork.h"
@@ -44,16 +45,15 @@ struct NameCollector final : IkxSysItemCollector {
 // 02-11-22-FF-FE-33-44-55, after one discovery. Discovery waits 30 ms.
 class ExpertFixture : public ::testing::Test {
   protected:
-    static constexpr const char16_t* kPort1 = u"02-11-22-FF-FE-33-44-55:1";
+    static constexpr const OLECHAR* kPort1 = OLESTR("02-11-22-FF-FE-33-44-55:1");
 
-    // Settings and lock files of the test's own.
+    // Lock files of the test's own (on POSIX).
     static void SetUpTestSuite() {
+#ifndef _WIN32
         char folder[] = "/tmp/qv-expert-XXXXXX";
         ASSERT_NE(::mkdtemp(folder), nullptr);
-        key_ = std::filesystem::path(folder) / "Software/Quarvel/Corbel/qv-1588";
-        std::filesystem::create_directories(key_);
-        ::setenv("QV_SETTINGS_ROOT", folder, 1);
-        ::setenv("QV_LOCK_DIR", folder, 1);
+        qv::dsc::osdep::EnvironmentVariable::set("QV_LOCK_DIR", folder);
+#endif
     }
     ExpertFixture() : clock(identity(0x55), 2) {
         network.attach(clock);
@@ -62,11 +62,14 @@ class ExpertFixture : public ::testing::Test {
         EXPECT_EQ(expert->GetItemNames(names.Receive()), S_OK);
         newRequests();
     }
-    ~ExpertFixture() override { expert->Shutdown(); }
+    ~ExpertFixture() override {
+        expert->Shutdown();
+    }
 
     // An expert whose discovery waits `waitMs`.
     static tExpert newExpert(nQVPTP000::iPTPPortMessaging& on, unsigned waitMs = 30) {
-        std::ofstream(key_ / "findClocksTimeout") << waitMs << '\n';
+        qv::dsc::osdep::EnvironmentVariable::set(
+            qv::dsc::osdep::FindClocksTimeout::kOverrideVariable, std::to_string(waitMs).c_str());
         CQVComObject<CPtpSysExpert>* created = nullptr;
         EXPECT_EQ(CQVComObject<CPtpSysExpert>::CreateInstance(&created), S_OK);
         tExpert held(created);
@@ -97,7 +100,7 @@ class ExpertFixture : public ::testing::Test {
                   S_OK);
         BSTR description = nullptr;
         failure->GetLastFailure(&description, nullptr);
-        const std::u16string text(description != nullptr ? description : u"");
+        const std::u16string text = qv::dsc::OleText::toLibrary(description);
         SysFreeString(description);
         return std::string(text.begin(), text.end());
     }
@@ -122,7 +125,6 @@ class ExpertFixture : public ::testing::Test {
         return ids;
     }
 
-    static inline std::filesystem::path key_;
     SimulatedNetwork network;
     SimulatedClock clock;
     InMemoryManagedClock& managed = clock.managed();

@@ -4,6 +4,7 @@
 #include <algorithm>
 #include <functional>
 
+#include "platform/OleText.h"
 #include "ptp/tManagementIdTable.h"
 #include "tests/expert/clocks/ExpertFixture.h"
 #include "tests/support/FailingAllocation.h"
@@ -13,6 +14,7 @@ namespace {
 
 using namespace nQVPTP000;
 using namespace qvtest;
+using qv::dsc::OleText;
 using tIds = std::vector<std::uint16_t>;
 using tChange = std::function<void(IkxSysPropertyBag2&)>;
 const tIds kDiscovery(4, kClockDescription);  // one request per domain 0 to 3
@@ -27,22 +29,24 @@ TEST_F(ExpertFixture, ListingsRefreshEveryTimeAndAnItemLookupOnlyForAnUnknownNam
     EXPECT_EQ(newRequests().size(), 2 * kDiscovery.size());
     CQVComPtr<IkxSysPropertyBag> bag;
     // Any spelling that finds a clock gives it the name of its port identity.
-    for (const char16_t* spelling : {u"02-11-22-ff-fe-33-44-55:1", u"2-11-22-FF-FE-33-44-55:01"}) {
+    for (const OLECHAR* spelling :
+         {OLESTR("02-11-22-ff-fe-33-44-55:1"), OLESTR("2-11-22-FF-FE-33-44-55:01")}) {
         ASSERT_EQ(expert->GetItem(spelling, bag.Receive()), S_OK);
         EXPECT_EQ(textOf(*bag.get(), kxSysItemName), "02-11-22-FF-FE-33-44-55:1");
         EXPECT_EQ(textOf(*bag.get(), kxQvClockPortName), "02-11-22-FF-FE-33-44-55:1");
     }
     EXPECT_EQ(newRequests(), tIds());
     // A port number is 16 bits: these do not wrap to port 1, and name no port to ask.
-    for (const char16_t* name : {u"02-11-22-FF-FE-33-44-55:65537",
-                                 u"02-11-22-FF-FE-33-44-55:-65535", u"02-11-22-FF-FE-33-44-55"}) {
+    for (const OLECHAR* name :
+         {OLESTR("02-11-22-FF-FE-33-44-55:65537"), OLESTR("02-11-22-FF-FE-33-44-55:-65535"),
+          OLESTR("02-11-22-FF-FE-33-44-55")}) {
         EXPECT_EQ(expert->GetItem(name, bag.Receive()), CORBEL_E_ITEM_NOT_FOUND);
     }
     EXPECT_EQ(newRequests(), tIds());
     SimulatedClock later(identity(0x56));
     network.attach(later);
     const kxSysAttributeTagID tag = kxQvPriority1;
-    const char16_t* laterName = u"02-11-22-FF-FE-33-44-56:1";
+    const OLECHAR* laterName = OLESTR("02-11-22-FF-FE-33-44-56:1");
     EXPECT_EQ(expert->GetItemProperties(laterName, 1, &tag, nullptr, bag.Receive()),
               CORBEL_E_ITEM_NOT_FOUND);
     EXPECT_EQ(newRequests(), tIds());
@@ -63,8 +67,8 @@ TEST_F(ExpertFixture, AnUnknownNameIsAskedForByNameAndItsAnswerEndsTheWait) {
     auto patient = newExpert(own, 65535);
     own.inject({0}, std::chrono::milliseconds(65535));
     CQVComPtr<IkxSysPropertyBag> bag;
-    for (const char16_t* name :
-         {u"02-11-22-FF-FE-33-44-55:2", kPort1, u"2-11-22-FF-FE-33-44-55:2"}) {
+    for (const OLECHAR* name :
+         {OLESTR("02-11-22-FF-FE-33-44-55:2"), kPort1, OLESTR("2-11-22-FF-FE-33-44-55:2")}) {
         EXPECT_EQ(patient->GetItem(name, bag.Receive()), S_OK);
     }
     EXPECT_EQ(own.queuedCount(), 1U);
@@ -72,7 +76,7 @@ TEST_F(ExpertFixture, AnUnknownNameIsAskedForByNameAndItsAnswerEndsTheWait) {
     ASSERT_EQ(sent.size(), 2 * kDiscovery.size());
     EXPECT_EQ(decodeManagement(sent[3])->getTargetPortIdentity(), tPortIdentity(identity(0x55), 2));
     patient->Shutdown();
-    EXPECT_EQ(expert->GetItem(u"02-11-22-FF-FE-33-44-57:1", bag.Receive()),
+    EXPECT_EQ(expert->GetItem(OLESTR("02-11-22-FF-FE-33-44-57:1"), bag.Receive()),
               CORBEL_E_ITEM_NOT_FOUND);
     EXPECT_EQ(newRequests(), kDiscovery);
 }
@@ -225,7 +229,9 @@ tChange real(double value) {
     return [=](IkxSysPropertyBag2& b) { b.SetDouble(kxQvAnnounceReceiptTimeout, value); };
 }
 tChange text(std::u16string value) {
-    return [=](IkxSysPropertyBag2& b) { b.SetString(kxQvUserDescription, value.c_str()); };
+    return [=](IkxSysPropertyBag2& b) {
+        b.SetString(kxQvUserDescription, OleText::toBoundary(value).c_str());
+    };
 }
 tChange seconds(std::int64_t value, std::uint64_t fraction = 0) {
     return [=](IkxSysPropertyBag2& b) {
@@ -290,7 +296,7 @@ TEST_F(ExpertFixture, ValidationAcceptsOrExplainsInChangedTagOrderAndSendsNothin
         BSTR message = nullptr;
         EXPECT_EQ(expert->ValidateChanges(nullptr, bag.get(), accepted.Receive(), &message),
                   c.result);
-        EXPECT_EQ(std::u16string(message != nullptr ? message : u""), c.message);
+        EXPECT_EQ(OleText::toLibrary(message), c.message);
         SysFreeString(message);
         tTags tags(c.accepted.size() + 1);
         ULONG fetched = 0;
@@ -370,10 +376,11 @@ TEST_F(ExpertFixture, ApplyWritesInChangedTagOrderAndStopsAtTheFirstFailure) {
     EXPECT_EQ(expert->ApplyChanges(kPort1, bag.get(), nullptr), E_FAIL);
     EXPECT_EQ(newRequests(), tIds{kPriority1});
     EXPECT_EQ(std::get<2>(lastCause()), kxQvPriority1);
-    EXPECT_EQ(expert->ApplyChanges(u"02-11-22-FF-FE-33-44-55:9", bag.get(), nullptr), E_FAIL);
+    EXPECT_EQ(expert->ApplyChanges(OLESTR("02-11-22-FF-FE-33-44-55:9"), bag.get(), nullptr),
+              E_FAIL);
     bag->ClearChangedTags();
     u32(kxQvStepsRemoved, 1)(*bag.get());
-    EXPECT_EQ(expert->ApplyChanges(u"no clock", bag.get(), nullptr), S_OK);
+    EXPECT_EQ(expert->ApplyChanges(OLESTR("no clock"), bag.get(), nullptr), S_OK);
     EXPECT_EQ(newRequests(), tIds());
 }
 

@@ -51,12 +51,16 @@ HANDLE namedEvent(const std::string& name) {
 
 }  // namespace
 
-TEST(FindClocksTimeoutWin32Test, ReadsTheLow16BitsOfANumberInTheRegistry) {
+TEST(FindClocksTimeoutWin32Test, ReadsTheLow16BitsOfANumberInTheRegistryOrTheEnvironment) {
     tTimeoutValue value;
     EXPECT_EQ(FindClocksTimeout::read(), 1000);  // no value yet
     const DWORD large = 70000;
     value.set(REG_DWORD, &large, sizeof(large));
     EXPECT_EQ(FindClocksTimeout::read(), 4464);
+    // A host's own SetEnvironmentVariable overrides the registry for its process.
+    SetEnvironmentVariableA(FindClocksTimeout::kOverrideVariable, "0x12C");
+    EXPECT_EQ(FindClocksTimeout::read(), 300);
+    SetEnvironmentVariableA(FindClocksTimeout::kOverrideVariable, nullptr);
     const wchar_t text[] = L"2000";
     value.set(REG_SZ, text, sizeof(text));
     EXPECT_EQ(FindClocksTimeout::read(), 1000);  // only a number counts

@@ -19,14 +19,14 @@ using qv::dsc::osdep::WinError;
 
 TEST(BStrWin32Test, StringsCrossTheBoundaryBothWays) {
     // Ours released by the host's SysFreeString, the host's released by ours.
-    qv::dsc::BSTR ours = BStr::allocate(u"a\0b", 3);
-    auto* asSystem = reinterpret_cast<::BSTR>(ours);
-    EXPECT_EQ(SysStringLen(asSystem), 3U);
-    EXPECT_EQ(SysStringByteLen(asSystem), 6U);
-    SysFreeString(asSystem);
+    ::BSTR ours = BStr::allocate(std::u16string_view(u"a\0b", 3));
+    EXPECT_EQ(SysStringLen(ours), 3U);
+    EXPECT_EQ(SysStringByteLen(ours), 6U);
+    EXPECT_EQ(ours[2], L'b');
+    SysFreeString(ours);
     ::BSTR theirs = SysAllocString(L"host");
-    EXPECT_EQ(BStr::length(reinterpret_cast<qv::dsc::BSTR>(theirs)), 4U);
-    BStr::release(reinterpret_cast<qv::dsc::BSTR>(theirs));
+    EXPECT_EQ(BStr::length(theirs), 4U);
+    BStr::release(theirs);
 }
 
 TEST(TaskMemoryWin32Test, BlocksAreTheHostsTaskMemory) {

@@ -85,6 +85,10 @@ std::unique_ptr<tManagementMessagePayload> SimulatedClock::payloadFor(tManagemen
         return nullptr;
     }
     const std::uint16_t managementId = asked->getManagementId();
+    if (refused_ == managementId) {
+        return std::make_unique<nQVPTP000::tManagementErrorStatusTLV>(
+            managementId, nQVPTP000::tManagementErrorStatusTLV::kNotSupported, "");
+    }
     switch (fault_) {
         case Fault::errorStatus:
             return std::make_unique<nQVPTP000::tManagementErrorStatusTLV>(

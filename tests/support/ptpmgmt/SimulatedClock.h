@@ -4,6 +4,7 @@
 #include <chrono>
 #include <cstdint>
 #include <mutex>
+#include <optional>
 #include <vector>
 
 #include "ptp/tClockIdentity.h"
@@ -57,6 +58,12 @@ class SimulatedClock {
         std::lock_guard<std::mutex> guard(lock_);
         fault_ = fault;
     }
+    // Requests of this management id are answered with MANAGEMENT_ERROR_STATUS
+    // NOT_SUPPORTED, as ptp4l refuses TIME; the others as usual.
+    void refuse(std::uint16_t managementId) {
+        std::lock_guard<std::mutex> guard(lock_);
+        refused_ = managementId;
+    }
     // Every answer goes out this long after the request.
     void setDelay(std::chrono::milliseconds delay) {
         std::lock_guard<std::mutex> guard(lock_);
@@ -92,8 +99,9 @@ class SimulatedClock {
     const nQVPTP000::tClockIdentity identity_;
     const std::uint16_t numberPorts_;
     mutable std::mutex lock_;
-    InMemoryManagedClock managed_;  // guarded by lock_
-    Fault fault_ = Fault::none;
+    InMemoryManagedClock managed_;          // guarded by lock_
+    Fault fault_ = Fault::none;             // guarded by lock_
+    std::optional<std::uint16_t> refused_;  // guarded by lock_
     std::chrono::milliseconds delay_{0};
 };
 
