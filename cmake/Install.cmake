@@ -28,6 +28,13 @@ install(TARGETS corbel RUNTIME DESTINATION ${CMAKE_INSTALL_BINDIR})
 install(FILES ${PROJECT_SOURCE_DIR}/corbel/cli/corbel.1 DESTINATION ${CMAKE_INSTALL_MANDIR}/man1)
 install(FILES ${PROJECT_SOURCE_DIR}/corbel/cli/corbel.bash-completion
         DESTINATION ${CMAKE_INSTALL_DATAROOTDIR}/bash-completion/completions RENAME corbel)
+# corbel serve as a systemd service; systemd finds units under <prefix>/lib/systemd/system
+# for the prefixes /usr and /usr/local.
+if(TARGET corbel_serve)
+  configure_file(${PROJECT_SOURCE_DIR}/corbel/serve/corbel-serve.service.in
+                 ${CMAKE_CURRENT_BINARY_DIR}/corbel-serve.service @ONLY)
+  install(FILES ${CMAKE_CURRENT_BINARY_DIR}/corbel-serve.service DESTINATION lib/systemd/system)
+endif()
 install(EXPORT qv1588Targets NAMESPACE qv1588:: DESTINATION ${QV_CMAKE_PACKAGE_DIR})
 
 file(WRITE ${CMAKE_CURRENT_BINARY_DIR}/qv1588Config.cmake

@@ -136,7 +136,43 @@ struct CommandSpec {
     CLI::App* app;
 };
 
-std::vector<CommandSpec> addCommands(Parser& parser, std::vector<std::string>& arguments) {
+#ifdef QV_CORBEL_SERVE
+// corbel serve's own options.
+void serveOptions(CLI::App* serve, ServeOptions& options) {
+    serve->add_option("--listen", options.listen, "address and port to listen on")
+        ->type_name("ADDR:PORT")
+        ->capture_default_str();
+    serve->add_option("--interval", options.interval, "seconds between two reads of every clock")
+        ->type_name("S")
+        ->check(numberCheck("seconds", 1, 3600, true))
+        ->capture_default_str();
+    serve->add_option("--rediscover", options.rediscover, "seconds between two discoveries")
+        ->type_name("S")
+        ->check(numberCheck("seconds", 1, 86400, true))
+        ->capture_default_str();
+    serve->add_flag("--read-only", options.readOnly, "refuse every write");
+    serve
+        ->add_option("--token-file", options.tokenFile,
+                     "the token that writes need, on the file's first line (else "
+                     "CORBEL_SERVE_TOKEN, else one is made and printed at start)")
+        ->type_name("FILE");
+    serve
+        ->add_option("--allow-host", options.allowHosts,
+                     "a further name that requests may give as Host (repeatable)")
+        ->type_name("NAME")
+        ->allow_extra_args(false);
+}
+
+const char* const kServeFooter =
+    R"(Runs until SIGTERM or Ctrl-C. One thread reads every clock each interval and keeps the
+last hour of each; HTTP requests read what it published: GET /api/v1/status, /api/v1/clocks,
+/api/v1/clocks/ITEM, /api/v1/clocks/ITEM/history, /api/v1/events?since=ID, /metrics (for
+Prometheus), / (the explorer page); POST /api/v1/clocks/ITEM/settings with the header
+"Authorization: Bearer TOKEN" writes. Requests must name the server in their Host header.)";
+#endif
+
+std::vector<CommandSpec> addCommands(Parser& parser, Invocation& invocation) {
+    std::vector<std::string>& arguments = invocation.arguments;
     CLI::App& app = parser.app();
     const auto add = [&](const char* name, const std::string& description) {
         CLI::App* command = app.add_subcommand(name, description);
@@ -181,9 +217,19 @@ std::vector<CommandSpec> addCommands(Parser& parser, std::vector<std::string>& a
         ->required();
     watch->add_option("ITEM", arguments, "the item names to watch (default: every clock)")
         ->type_name("");
-    return {{Command::info, info},   {Command::version, version}, {Command::list, list},
-            {Command::items, items}, {Command::tags, tags},       {Command::show, show},
-            {Command::set, set},     {Command::watch, watch}};
+    std::vector<CommandSpec> commands = {{Command::info, info}, {Command::version, version},
+                                         {Command::list, list}, {Command::items, items},
+                                         {Command::tags, tags}, {Command::show, show},
+                                         {Command::set, set},   {Command::watch, watch}};
+#ifdef QV_CORBEL_SERVE
+    auto* serve = add("serve", "the clocks as a live HTTP API, Prometheus metrics and a page");
+    serve->footer(kServeFooter);
+    parser.expert(serve);
+    parser.network(serve);
+    serveOptions(serve, invocation.serve);
+    commands.push_back({Command::serve, serve});
+#endif
+    return commands;
 }
 
 // CLI11's words for an argument that no option takes, in ours.
@@ -225,7 +271,7 @@ Invocation parseCommandLine(int argc, const char* const* argv) {
     parser.expert(&app);
     parser.json(&app);
     parser.network(&app);
-    const auto commands = addCommands(parser, invocation.arguments);
+    const auto commands = addCommands(parser, invocation);
     app.allow_extras();  // after the commands, which do not inherit it: see below
     const bool json = asksForJson(argc, argv);
     try {

@@ -7,10 +7,11 @@
 #include <vector>
 
 #include "corbel/ExitCode.h"
+#include "corbel/serve/ServeOptions.h"
 
 namespace corbel {
 
-enum class Command { info, version, list, items, tags, show, set, watch };
+enum class Command { info, version, list, items, tags, show, set, watch, serve };
 
 // Every option of a run; each command's parser offers only the ones that apply to it.
 struct Options {
@@ -30,6 +31,7 @@ struct Invocation {
     Command command = Command::info;
     Options options;
     std::vector<std::string> arguments;  // the command's words: items, tags, NAME=VALUE
+    ServeOptions serve;                  // corbel serve's own options
     // Set when the run is already over: help or the version was printed, or a usage error
     // was reported (as JSON with --json).
     std::optional<ExitCode> finished;

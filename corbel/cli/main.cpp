@@ -5,7 +5,11 @@
 #include <cstdio>
 #include <exception>
 
+#include "corbel/cli/CommandContext.h"
 #include "corbel/cli/Commands.h"
+#ifdef QV_CORBEL_SERVE
+#include "corbel/serve/ServeCommand.h"
+#endif
 
 namespace {
 
@@ -33,6 +37,18 @@ ExitCode run(const corbel::Invocation& invocation) {
             return corbel::runSet(options, arguments);
         case Command::watch:
             return corbel::runWatch(options, arguments);
+        case Command::serve: {
+#ifdef QV_CORBEL_SERVE
+            // The expert opens as for every command (--expert, --wait, --interface,
+            // --verbose) and is shut down when the context ends, after the service.
+            corbel::CommandContext context(options);
+            return corbel::runServe(invocation.serve, [&context](ExitCode& failed) {
+                return context.open(true, failed) ? &context.expert() : nullptr;
+            });
+#else
+            return ExitCode::kBadUsage;
+#endif
+        }
     }
     return ExitCode::kBadUsage;
 }

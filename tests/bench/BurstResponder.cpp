@@ -3,6 +3,7 @@
 #include <arpa/inet.h>
 #include <netinet/in.h>
 #include <poll.h>
+#include <pthread.h>
 #include <sys/socket.h>
 #include <unistd.h>
 
@@ -31,12 +32,29 @@ constexpr std::size_t kMinimumRequest = 54;
 constexpr std::uint16_t kGeneralPort = 320;
 constexpr const char* kGroup = "224.0.1.129";
 
-std::vector<std::uint8_t> corpusAnswer() {
-    std::ifstream in(std::string(QV_SOURCE_DIR) +
-                     "/tests/data/corpus/ptp4l-mgmt-clock_description.hex");
+std::vector<std::uint8_t> corpusAnswer(const std::string& name = "clock_description") {
+    std::ifstream in(std::string(QV_SOURCE_DIR) + "/tests/data/corpus/ptp4l-mgmt-" + name + ".hex");
     std::stringstream text;
     text << in.rdbuf();
     return hexOctets(text.str());
+}
+
+// ptp4l's answers to the GETs of a read of every group, by the management id they answer:
+// that of the management TLV, or the one an error status TLV names two octets later.
+std::map<std::uint16_t, std::vector<std::uint8_t>> corpusReads() {
+    std::map<std::uint16_t, std::vector<std::uint8_t>> answers;
+    for (const char* name :
+         {"clock_description", "default_data_set", "current_data_set", "parent_data_set",
+          "time_properties_data_set", "port_data_set", "time-error", "utc_properties-error"}) {
+        std::vector<std::uint8_t> answer = corpusAnswer(name);
+        if (answer.size() >= kMinimumRequest + 2) {
+            const std::size_t id =
+                answer[kManagementId - 3] == 0x02 ? kManagementId + 2 : kManagementId;
+            answers[static_cast<std::uint16_t>(answer[id] << 8 | answer[id + 1])] =
+                std::move(answer);
+        }
+    }
+    return answers;
 }
 
 bool isDiscovery(const std::uint8_t* m, std::size_t length) {
@@ -53,8 +71,13 @@ bool isDiscovery(const std::uint8_t* m, std::size_t length) {
 
 }  // namespace
 
-BurstResponder::BurstResponder(std::string nameSpace, std::uint16_t clocks, std::uint16_t ports)
-    : nameSpace_(std::move(nameSpace)), clocks_(clocks), ports_(ports), template_(corpusAnswer()) {}
+BurstResponder::BurstResponder(std::string nameSpace, std::uint16_t clocks, std::uint16_t ports,
+                               bool answerReads)
+    : nameSpace_(std::move(nameSpace)), clocks_(clocks), ports_(ports), template_(corpusAnswer()) {
+    if (answerReads) {
+        reads_ = corpusReads();
+    }
+}
 
 BurstResponder::~BurstResponder() {
     stop();
@@ -82,6 +105,16 @@ bool BurstResponder::start(std::string& failure) {
     }
     failure = failure_;
     return ready_.load() == 1;
+}
+
+double BurstResponder::cpuSeconds() const {
+    clockid_t clock{};
+    timespec used{};
+    if (pthread_getcpuclockid(const_cast<std::thread&>(thread_).native_handle(), &clock) != 0 ||
+        clock_gettime(clock, &used) != 0) {
+        return 0;
+    }
+    return static_cast<double>(used.tv_sec) + static_cast<double>(used.tv_nsec) / 1e9;
 }
 
 void BurstResponder::stop() {
@@ -124,9 +157,45 @@ void BurstResponder::run() {
         const ssize_t length = recv(socket_, datagram, sizeof datagram, 0);
         if (length > 0 && isDiscovery(datagram, static_cast<std::size_t>(length))) {
             answer(datagram, static_cast<std::size_t>(length));
+        } else if (length > 0 && !reads_.empty()) {
+            answerRead(datagram, static_cast<std::size_t>(length));
         }
     }
     ::close(socket_);
+}
+
+void BurstResponder::answerRead(const std::uint8_t* request, std::size_t length) {
+    const auto identity = identityOf(0);
+    const auto clock =
+        static_cast<std::uint16_t>(request[kTargetPort + 6] << 8 | request[kTargetPort + 7]);
+    const auto port =
+        static_cast<std::uint16_t>(request[kTargetPort + 8] << 8 | request[kTargetPort + 9]);
+    const auto answer = reads_.find(
+        static_cast<std::uint16_t>(request[kManagementId] << 8 | request[kManagementId + 1]));
+    if (length < kMinimumRequest || (request[0] & 0x0F) != 0x0D || (request[kAction] & 0x0F) != 0 ||
+        std::memcmp(&request[kTargetPort], identity.data(), 6) != 0 || clock >= clocks_ ||
+        port == 0 || port > ports_ || request[kDomain] != clock % 4 || answer == reads_.end()) {
+        return;
+    }
+    std::vector<std::uint8_t> reply = answer->second;
+    std::memcpy(&reply[kSourcePort], &request[kTargetPort], 10);
+    send(reply, request);
+}
+
+void BurstResponder::send(std::vector<std::uint8_t>& reply, const std::uint8_t* request) {
+    sockaddr_in destination{};
+    destination.sin_family = AF_INET;
+    destination.sin_port = htons(kGeneralPort);
+    destination.sin_addr.s_addr = inet_addr(kGroup);
+    reply[kDomain] = request[kDomain];
+    std::memcpy(&reply[kSequenceId], &request[kSequenceId], 2);
+    std::memcpy(&reply[kTargetPort], &request[kSourcePort], 10);
+    while (sendto(socket_, reply.data(), reply.size(), 0,
+                  reinterpret_cast<const sockaddr*>(&destination), sizeof destination) < 0 &&
+           (errno == ENOBUFS || errno == EAGAIN) && !stopping_.load()) {
+        std::this_thread::sleep_for(std::chrono::microseconds(100));
+    }
+    sent_.fetch_add(1);
 }
 
 void BurstResponder::answer(const std::uint8_t* request, std::size_t /*length*/) {
