@@ -97,6 +97,17 @@ test('the hierarchy: each domain grandmaster on top, a slave under its master', 
   await shot(page, 'hierarchy.png');
 });
 
+test('the health colours follow the thresholds the user sets, kept across visits', {skip: readOnly}, async () => {
+  const page = await open('');
+  await page.locator('summary').press('Enter');
+  await page.fill('#delayAlarm', '0');
+  await page.press('#delayAlarm', 'Enter');
+  const delay = `tr[data-item="${follower}"] td[data-column=meanPathDelay].health-alarm`;
+  await page.locator(delay).waitFor();
+  await page.reload();
+  await page.locator(delay).waitFor();
+});
+
 test('one clock, reached by keyboard: its data sets and a chart with points', {skip: readOnly}, async () => {
   const page = await open('');
   await page.focus(`#clocks a[href="#/clock/${encodeURIComponent(follower)}"]`);
