@@ -19,6 +19,7 @@ const state = {
   events: [],  // oldest first, as the server keeps them
   lastEvent: 0,
   clock: null,  // the clock of the clock view, or null
+  missing: '',  // the item of the clock view when the server knows no such clock
   history: null,
   historyAt: 0,
 };
@@ -60,7 +61,8 @@ function renderClockView(view) {
   $('clockBody').hidden = !clock;
   if (!clock) {
     setText($('clock-title'), view.item);
-    setText($('clockState'), 'No clock port answers to this item name.');
+    setText($('clockState'), state.missing === view.item ?
+      'No clock port answers to this item name.' : 'Reading the clock …');
     return;
   }
   renderHeader(clock, $('clock-title'), $('clockState'));
@@ -99,9 +101,12 @@ async function readEvents() {
   const answer = await getJson('/api/v1/events?since=' + state.lastEvent);
   if (answer.last < state.lastEvent) {
     state.events = [];  // the server started again: its numbers did too
+    state.lastEvent = 0;
   }
-  state.events = state.events.concat(answer.events || []).slice(-1000);
-  state.lastEvent = answer.last;
+  // Two reads may overlap (a write refreshes at once): keep each event once.
+  const fresh = (answer.events || []).filter((event) => event.id > state.lastEvent);
+  state.events = state.events.concat(fresh).slice(-1000);
+  state.lastEvent = Math.max(state.lastEvent, answer.last);
 }
 
 async function readClock(item) {
@@ -118,6 +123,7 @@ async function readClock(item) {
   const history = due ? await getJson(clockPath(item) + '/history') : state.history;
   if (route().item === item) {  // the user may have moved on meanwhile
     state.clock = clock;
+    state.missing = clock ? '' : item;
     state.history = history;
     state.historyAt = due ? Date.now() : state.historyAt;
   }
@@ -135,8 +141,8 @@ async function refresh() {
   } catch (failure) {
     const why = failure instanceof ApiError ? `answers ${failure.status} ${failure.word}: ` +
       failure.message : 'does not answer';
-    banner(`The server ${why} (${new Date().toLocaleTimeString([], {hour12: false})}); ` +
-        'trying again.');
+    banner(failure.status === 503 ? 'The server is finding the clocks; the first discovery ' +
+        'has not finished yet.' : `The server ${why} (${timeOfDay(new Date())}); trying again.`);
   }
   render();
 }

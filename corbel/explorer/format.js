@@ -36,13 +36,13 @@ export function wordText(value) {
   return isRead(value) && value.word ? value.word : valueText(value);
 }
 
-// A time of day in the browser's zone, with seconds: "20:42:10".
-export function timeOfDay(iso) {
-  if (!iso) {
+// A time of day in the browser's zone, with seconds: "20:42:10". Takes ISO 8601 or a Date.
+export function timeOfDay(when) {
+  if (!when) {
     return '—';
   }
-  const time = new Date(iso);
-  return Number.isNaN(time.getTime()) ? iso : time.toLocaleTimeString([], {hour12: false});
+  const time = new Date(when);
+  return Number.isNaN(time.getTime()) ? String(when) : time.toLocaleTimeString([], {hour12: false});
 }
 
 // Replaces an element's text only when it differs, so that a live view does not disturb a

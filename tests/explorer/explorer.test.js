@@ -149,7 +149,9 @@ test('a write without a valid token is refused with a clear message', {skip: rea
   const page = await open('#/clock/' + encodeURIComponent(writable));
   await page.waitForSelector('#set-priority1');
   const {last} = await api('/api/v1/events?since=0');
-  assert.equal(await send(page, {'#set-priority1': '7', '#token': 'not-the-token'}), 'unauthorized');
+  assert.equal(await send(page, {'#set-priority1': '7'}), 'local');
+  assert.match(await page.textContent('#tokenError'), /Enter the write token/);
+  assert.equal(await send(page, {'#token': 'not-the-token'}), 'unauthorized');
   assert.match(await page.textContent('#writeResult'), /refused the write without a valid token/);
   assert.deepEqual(await writesSince(last), []);
 });
