@@ -29,9 +29,9 @@ function newRow(item) {
 }
 
 // A quantity coloured by the user's thresholds; the colour's meaning is also said in words
-// for those who do not see it.
-function setHealthCell(cell, kind, value) {
-  const level = isRead(value) ? health(kind, value.value) : '';
+// for those who do not see it. The last values of a vanished clock are not judged.
+function setHealthCell(cell, kind, value, present) {
+  const level = present && isRead(value) ? health(kind, value.value) : '';
   const text = valueText(value);
   if (cell.dataset.text === text && cell.dataset.health === level) {
     return;
@@ -73,7 +73,7 @@ export function renderOverview(clocks, tbody, empty) {
     setText(cells.description, isRead(description) ? String(description.value) : '');
     for (const column of COLUMNS) {
       if (HEALTH_OF[column]) {
-        setHealthCell(cells[column], HEALTH_OF[column], clock.values[column]);
+        setHealthCell(cells[column], HEALTH_OF[column], clock.values[column], clock.present);
       } else {
         setText(cells[column], cellText(clock, column));
       }
