@@ -27,8 +27,9 @@ export async function getJson(path) {
   return body;
 }
 
+// Item names hold ':' ("02-11-22-FF-FE-33-44-55:1"), which a path carries as it is.
 export function clockPath(item) {
-  return '/api/v1/clocks/' + encodeURIComponent(item);
+  return '/api/v1/clocks/' + encodeURIComponent(item).replace(/%3A/g, ':');
 }
 
 // Sends changes to one clock. Answers {status, body} for every HTTP answer, since 422 and 502

@@ -47,7 +47,7 @@ async function open(hash) {
 }
 
 const shot = (page, name) => page.screenshot({path: join(shots, name), fullPage: true});
-const clock = async (item) => (await api('/api/v1/clocks/' + encodeURIComponent(item))).values;
+const clock = async (item) => (await api('/api/v1/clocks/' + item)).values;
 const writesSince = async (id) => (await api('/api/v1/events?since=' + id)).events
     .filter((event) => event.item === writable && ['written', 'refused'].includes(event.kind));
 
