@@ -66,7 +66,7 @@ function renderClockView(view) {
     return;
   }
   renderHeader(clock, $('clock-title'), $('clockState'));
-  renderValues(clock, $('groups'));
+  renderValues(clock, $('groups'), $('other'));
   if (state.history) {
     renderDrift(state.history, $('chart'), $('chartSummary'));
   }
@@ -175,4 +175,5 @@ bindThresholds($('thresholds'), $('thresholdsReset'), () => {
   forgetHealth();
   render();
 });
+render();  // the view's frame at once; its data with the first answers
 poll();

@@ -31,6 +31,7 @@ export function inGroupOrder(names) {
 function groupElement(title, names, values) {
   const section = element('section', 'group');
   const table = element('table');
+  section.append(table);
   table.append(element('caption', '', title));
   for (const name of names) {
     const value = values[name];
@@ -45,13 +46,15 @@ function groupElement(title, names, values) {
     row.append(head, cell);
     table.append(row);
   }
-  section.append(table);
   return section;
 }
 
 let shownValues = '';
 
-export function renderValues(clock, container) {
+// `other`: a <details> for the host's constant properties and any value of no data set,
+// folded away since they say little about the clock; it stays in place, so that its
+// summary keeps the focus across refreshes.
+export function renderValues(clock, container, other) {
   const signature = JSON.stringify(clock.values);
   if (signature === shownValues) {
     return;
@@ -59,9 +62,12 @@ export function renderValues(clock, container) {
   shownValues = signature;
   const listed = new Set(GROUPS.flatMap(([, names]) => names));
   const groups = GROUPS.map(([title, names]) => [title, names.filter((name) => name in clock.values)]);
-  groups.push(['Other values', Object.keys(clock.values).filter((name) => !listed.has(name))]);
+  const rest = Object.keys(clock.values).filter((name) => !listed.has(name));
   container.replaceChildren(...groups.filter(([, names]) => names.length > 0)
       .map(([title, names]) => groupElement(title, names, clock.values)));
+  other.hidden = rest.length === 0;
+  setText(other.querySelector('summary'), `Other values (${rest.length})`);
+  other.querySelector('div').replaceChildren(groupElement('Other values', rest, clock.values));
 }
 
 export function renderHeader(clock, title, state) {

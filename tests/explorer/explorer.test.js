@@ -37,19 +37,21 @@ async function until(condition, what) {
   assert.fail('waited 30 s in vain for ' + what);
 }
 
-// A new tab: its own session storage, so no write token is kept yet.
+// A new tab (the previous one closed): its own session storage, so no write token is kept.
+let page;
 async function open(hash) {
-  const page = await context.newPage();
+  await page?.close();
+  page = await context.newPage();
   page.on('console', (message) => message.type() === 'error' && errors.push(message.text()));
   page.on('pageerror', (error) => errors.push(error.message));
   await page.goto(base + '/' + hash);
   return page;
 }
 
-const shot = (page, name) => page.screenshot({path: join(shots, name), fullPage: true});
+const shot = (page, name, fullPage = true) => page.screenshot({path: join(shots, name), fullPage});
 const clock = async (item) => (await api('/api/v1/clocks/' + item)).values;
 const writesSince = async (id) => (await api('/api/v1/events?since=' + id)).events
-    .filter((event) => event.item === writable && ['written', 'refused'].includes(event.kind));
+    .filter((event) => event.item === writable && event.kind === 'written');
 
 before(async () => {
   mkdirSync(shots, {recursive: true});
@@ -58,7 +60,7 @@ before(async () => {
     executablePath: '/usr/bin/chromium',
     args: ['--no-sandbox', '--headless', '--disable-gpu', '--disable-background-networking',
       '--disable-component-update', '--disable-sync', '--no-first-run'],
-    viewport: {width: 1280, height: 800},
+    viewport: {width: 1280, height: 960},
   });
   context.setDefaultTimeout(15000);
 });
@@ -71,13 +73,15 @@ after(async () => {
 test('the overview lists every clock with its port state in words', {skip: readOnly}, async () => {
   const {clocks} = await api('/api/v1/clocks');
   assert.equal(clocks.length, Number(process.env.EXPLORER_CLOCKS));
-  const page = await open('');
+  page = await open('');
   await page.waitForFunction((n) => document.querySelectorAll('#clocks tbody tr').length === n &&
       !document.querySelector('#clocks td[data-column=lastRead]:empty'), clocks.length);
   const rows = await page.$$eval('#clocks tbody tr', (all) => all.map((row) =>
     [row.dataset.item, row.querySelector('[data-column=portState]').textContent]));
   assert.deepEqual(rows.map(([item]) => item), clocks.map((each) => each.item));
-  assert.ok(rows.every(([, state]) => /^[A-Z_]+$/.test(state)), JSON.stringify(rows));
+  // The words are the server's (corbel's formatter); the page shows the number where it has none.
+  const shape = clocks.every((each) => each.values.portState.word) ? /^[A-Z_]+$/ : /^\d+$/;
+  assert.ok(rows.every(([, state]) => shape.test(state)), JSON.stringify(rows));
   await shot(page, 'overview.png');
 });
 
@@ -85,7 +89,7 @@ test('the hierarchy: each domain grandmaster on top, a slave under its master', 
   const parentOf = async () => (await clock(follower)).parentPortIdentity.value;
   await until(async () => !(await parentOf()).startsWith(follower.split(':')[0]), 'the slave');
   const {clocks} = await api('/api/v1/clocks');
-  const page = await open('#/hierarchy');
+  page = await open('#/hierarchy');
   await page.locator(`li[data-item="${await parentOf()}"] li[data-item="${follower}"]`).waitFor();
   for (const domain of new Set(clocks.map((each) => each.domain))) {
     const grandmaster = clocks.find((each) => each.domain === domain)
@@ -98,8 +102,9 @@ test('the hierarchy: each domain grandmaster on top, a slave under its master', 
 });
 
 test('the health colours follow the thresholds the user sets, kept across visits', {skip: readOnly}, async () => {
-  const page = await open('');
-  await page.locator('summary').press('Enter');
+  page = await open('');
+  await page.locator(`tr[data-item="${follower}"] td[data-column=meanPathDelay]:not(:empty)`).waitFor();
+  await page.locator('.thresholds summary').press('Enter');
   await page.fill('#delayAlarm', '0');
   await page.press('#delayAlarm', 'Enter');
   const delay = `tr[data-item="${follower}"] td[data-column=meanPathDelay].health-alarm`;
@@ -109,13 +114,13 @@ test('the health colours follow the thresholds the user sets, kept across visits
 });
 
 test('one clock, reached by keyboard: its data sets and a chart with points', {skip: readOnly}, async () => {
-  const page = await open('');
+  page = await open('');
   await page.focus(`#clocks a[href="#/clock/${encodeURIComponent(follower)}"]`);
   await page.keyboard.press('Enter');
   await page.waitForFunction(() => Chart.getChart(document.getElementById('chart'))
       ?.data.datasets.every((set) => set.data.length > 0));
   await page.locator('#groups caption', {hasText: 'Default data set'}).waitFor();
-  await shot(page, 'clock.png');
+  await shot(page, 'clock.png', false);
 });
 
 async function send(page, values) {
@@ -129,7 +134,7 @@ async function send(page, values) {
 
 test('an edit of priority1 is shown after the write; 300 is rejected by the field and not sent',
     {skip: readOnly}, async () => {
-      const page = await open('#/clock/' + encodeURIComponent(writable));
+      page = await open('#/clock/' + encodeURIComponent(writable));
       await page.waitForSelector('#set-priority1');
       const next = (await clock(writable)).priority1.value === 61 ? 62 : 61;
       const token = process.env.EXPLORER_TOKEN;
@@ -146,7 +151,7 @@ test('an edit of priority1 is shown after the write; 300 is rejected by the fiel
     });
 
 test('a write without a valid token is refused with a clear message', {skip: readOnly}, async () => {
-  const page = await open('#/clock/' + encodeURIComponent(writable));
+  page = await open('#/clock/' + encodeURIComponent(writable));
   await page.waitForSelector('#set-priority1');
   const {last} = await api('/api/v1/events?since=0');
   assert.equal(await send(page, {'#set-priority1': '7'}), 'local');
@@ -157,7 +162,7 @@ test('a write without a valid token is refused with a clear message', {skip: rea
 });
 
 test('a read-only server offers no form', {skip: !readOnly}, async () => {
-  const page = await open('#/clock/' + encodeURIComponent(writable));
+  page = await open('#/clock/' + encodeURIComponent(writable));
   await page.locator('#readOnly').waitFor();
   assert.equal(await page.isVisible('#settings'), false);
 });
