@@ -10,8 +10,13 @@ function text(clock, name) {
   return isRead(value) ? String(value.value) : '';
 }
 
-function reportsItselfGrandmaster(clock) {
-  return identityOf(text(clock, 'grandmasterIdentity')) === identityOf(clock.clockIdentity);
+// IEEE 1588 port states in which a port serves no clock: INITIALIZING, FAULTY, DISABLED,
+// LISTENING. A clock that has found no master reports itself as grandmaster meanwhile.
+const IDLE_STATES = new Set([1, 2, 3, 4]);
+
+function isGrandmaster(clock) {
+  return identityOf(text(clock, 'grandmasterIdentity')) === identityOf(clock.clockIdentity) &&
+      !IDLE_STATES.has(clock.values.portState?.value);
 }
 
 // Links each clock of one domain to its parent; answers the top nodes and the problems seen.
@@ -41,7 +46,7 @@ function linkDomain(clocks) {
     }
     target.children.push(node);
   }
-  const grandmasters = tops.filter((node) => reportsItselfGrandmaster(node.clock));
+  const grandmasters = tops.filter((node) => isGrandmaster(node.clock));
   if (grandmasters.length > 1) {
     problems.push(grandmasters.length + ' clock ports are grandmaster of this domain: ' +
         grandmasters.map((node) => node.clock.item).join(', ') + '.');
@@ -76,7 +81,7 @@ function checkTrees(linked) {
   return loop;
 }
 
-function nodeElement(node, grandmasters) {
+function nodeElement(node, grandmasters, top) {
   const item = element('li', 'node');
   const card = element('div', 'card');
   item.append(card);
@@ -91,6 +96,8 @@ function nodeElement(node, grandmasters) {
     if (grandmasters.includes(node)) {
       item.classList.add('grandmaster');
       card.append(element('span', 'badge gm', 'grandmaster'));
+    } else if (top) {
+      card.append(element('span', 'badge', 'follows no master'));
     }
     if (!clock.present) {
       card.append(element('span', 'badge', 'vanished'));
@@ -103,7 +110,7 @@ function nodeElement(node, grandmasters) {
   }
   if (node.children.length > 0) {
     const list = element('ul');
-    node.children.forEach((child) => list.append(nodeElement(child, grandmasters)));
+    node.children.forEach((child) => list.append(nodeElement(child, grandmasters, false)));
     item.append(list);
   }
   return item;
@@ -124,7 +131,8 @@ function domainElement(domain, clocks) {
     section.append(problems);
   }
   const tree = element('ul', 'tree');
-  [...linked.tops, ...loop].forEach((node) => tree.append(nodeElement(node, linked.grandmasters)));
+  [...linked.tops, ...loop].forEach((node) =>
+    tree.append(nodeElement(node, linked.grandmasters, linked.tops.includes(node))));
   section.append(tree);
   return section;
 }
