@@ -4,6 +4,8 @@
 #include <cstdio>
 #include <cstring>
 
+#include "platform/WinError.h"
+
 namespace {
 
 constexpr std::size_t kTextWord = 2;
@@ -47,9 +49,18 @@ void tStatusReason::record(tStatus& status, tKind kind, std::uint64_t number) no
 void tStatusReason::refused(tStatus& status, std::uint16_t managementErrorId,
                             std::string_view displayText) noexcept {
     record(status, tKind::kRefused, managementErrorId);
-    if (carries(status) && !displayText.empty()) {
-        std::memcpy(&status.extension[kTextWord], displayText.data(),
-                    std::min(displayText.size(), kTextSize - 1));
+    keepText(status, displayText);
+}
+
+void tStatusReason::systemCall(tStatus& status, std::string_view call, int systemError) noexcept {
+    record(status, tKind::kSystemCall, static_cast<std::uint64_t>(systemError));
+    keepText(status, call);
+}
+
+void tStatusReason::keepText(tStatus& status, std::string_view text) noexcept {
+    if (carries(status) && !text.empty()) {
+        std::memcpy(&status.extension[kTextWord], text.data(),
+                    std::min(text.size(), kTextSize - 1));
     }
 }
 
@@ -109,6 +120,9 @@ std::string tStatusReason::describe(const tStatus& status) {
             std::snprintf(line, sizeof line, "datagram of %llu octets dropped",
                           static_cast<unsigned long long>(number));
             return line;
+        case tKind::kSystemCall:
+            return std::string(textOf(status)) +
+                   " failed: " + qv::dsc::osdep::WinError::messageOf(static_cast<int>(number));
         default:
             return {};
     }

@@ -22,6 +22,7 @@ class tStatusReason {
         kNoAnswer = 2,     // number: the time-out in milliseconds
         kWrongAnswer = 3,  // number: the answer's actionField << 16 | its managementId
         kBadDatagram = 4,  // number: the datagram's length; the socket itself is sound
+        kSystemCall = 5,   // number: the system's error number; text: the call that failed
     };
     static constexpr std::size_t kTextSize = 8 * (tStatus::kExtensionWords - 2);
 
@@ -31,17 +32,22 @@ class tStatusReason {
     static void wrongAnswer(tStatus& status, std::uint32_t actionField,
                             std::uint16_t managementId) noexcept;
     static void badDatagram(tStatus& status, std::uint64_t length) noexcept;
+    // A call to the operating system failed: `call` names it ("bind to UDP port 319"),
+    // `systemError` is errno (on Windows the system's own number).
+    static void systemCall(tStatus& status, std::string_view call, int systemError) noexcept;
 
     static tKind kindOf(const tStatus& status) noexcept;
     static std::uint64_t numberOf(const tStatus& status) noexcept;
     // The text as stored: cut to kTextSize - 1 octets, not converted.
     static std::string_view textOf(const tStatus& status) noexcept;
 
-    // The reason in words, e.g. "refused by the clock: NOT_SUPPORTED" or "no answer within
-    // 5000 ms"; empty when the record carries no reason.
+    // The reason in words, e.g. "refused by the clock: NOT_SUPPORTED", "no answer within
+    // 5000 ms" or "sendto failed: Network is unreachable"; empty when the record carries no
+    // reason.
     static std::string describe(const tStatus& status);
 
   private:
+    static void keepText(tStatus& status, std::string_view text) noexcept;
     static bool carries(const tStatus& status) noexcept;
     static void record(tStatus& status, tKind kind, std::uint64_t number) noexcept;
 };

@@ -31,6 +31,8 @@ kxQvFailureKind kindOf(const tStatus& status) {
         case tStatusReason::tKind::kNoAnswer:
         case tStatusReason::tKind::kWrongAnswer:
             return kxQvFailureKind::noAnswer;
+        case tStatusReason::tKind::kSystemCall:
+            return kxQvFailureKind::network;
         default:
             break;
     }

@@ -1,7 +1,9 @@
 #include "tests/support/ptpmgmt/SimulatedNetwork.h"
 
+#include <cerrno>
 #include <new>
 
+#include "platform/tStatusReason.h"
 #include "tests/support/FailingAllocation.h"
 
 using nQVPTP000::tProtocolDataUnit;
@@ -33,6 +35,7 @@ void SimulatedNetwork::send(tProtocolDataUnit& unit, tStatus& status) {
             if (!open_.load() || fails) {
                 failingSends_ -= fails ? 1 : 0;
                 status.set(kStatusSocketError, "simnet", "SimulatedNetwork", __LINE__);
+                tStatusReason::systemCall(status, "sendto", ENETUNREACH);
                 return;
             }
             sendsBeforeFailure_ -= sendsBeforeFailure_ > 0 ? 1 : 0;
