@@ -9,7 +9,8 @@ namespace qv::dsc::osdep {
 
 namespace {
 
-constexpr std::size_t kMaxValueText = 64;
+constexpr std::size_t kMaxNumberText = 64;
+constexpr std::size_t kMaxValueText = 4096;
 
 bool isSpecialSegment(std::string_view segment) {
     return segment.empty() || segment == "." || segment == "..";
@@ -52,6 +53,14 @@ SettingsStore::SettingsStore(std::string_view keyPath) {
 }
 
 std::optional<std::uint32_t> SettingsStore::readNumber(std::string_view valueName) const {
+    const std::optional<std::string> text = readText(valueName);
+    if (!text || text->size() > kMaxNumberText) {
+        return std::nullopt;
+    }
+    return parseNumber(*text);
+}
+
+std::optional<std::string> SettingsStore::readText(std::string_view valueName) const {
     if (isSpecialSegment(valueName) || valueName.find('/') != valueName.npos ||
         valueName.find('\0') != valueName.npos) {
         return std::nullopt;
@@ -67,7 +76,7 @@ std::optional<std::uint32_t> SettingsStore::readNumber(std::string_view valueNam
         return std::nullopt;
     }
     text.resize(count);
-    return parseNumber(text);
+    return text;
 }
 
 }  // namespace qv::dsc::osdep

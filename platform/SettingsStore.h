@@ -24,6 +24,9 @@ class SettingsStore {
     // The stored number, or nothing when the key, the value or a valid 32-bit number in it
     // is missing. A value name that holds '/' or is "." or ".." is never found.
     std::optional<std::uint32_t> readNumber(std::string_view valueName) const;
+    // The stored text as it is (at most 4096 octets), or nothing when the value is missing,
+    // longer, or named as readNumber never finds.
+    std::optional<std::string> readText(std::string_view valueName) const;
 
     const std::string& folder() const { return folder_; }
 

@@ -88,7 +88,8 @@ void tMgmtMsgTransceiver::stop(tStatus& status) {
     threadController_.join();
 }
 
-std::uint16_t tMgmtMsgTransceiver::sendRequest(tManagementMessage& message, tStatus& status) {
+std::uint16_t tMgmtMsgTransceiver::sendRequest(tManagementMessage& message,
+                                               nQVPTP000::tInterfaceIndex via, tStatus& status) {
     if (!running_.load()) {
         QV_STATUS_SET(status, kStatusNoData, kComponentMgmt);
         return 0;
@@ -121,7 +122,7 @@ std::uint16_t tMgmtMsgTransceiver::sendRequest(tManagementMessage& message, tSta
         }
         tProtocolDataUnit unit(status);
         message.serialize(unit, status);
-        transport_->sendGeneralMessage(unit, status);
+        transport_->sendGeneralMessageVia(unit, via, status);
         if (status.failed()) {
             tStatus scratch;
             cancelRequest(sequenceId, scratch);
@@ -130,8 +131,8 @@ std::uint16_t tMgmtMsgTransceiver::sendRequest(tManagementMessage& message, tSta
     return sequenceId;
 }
 
-std::unique_ptr<tManagementMessage> tMgmtMsgTransceiver::takeResponse(std::uint16_t sequenceId,
-                                                                      tStatus& status) {
+std::unique_ptr<tManagementMessage> tMgmtMsgTransceiver::takeResponse(
+    std::uint16_t sequenceId, nQVPTP000::tInterfaceIndex& arrivedOn, tStatus& status) {
     nQVTARN000::tMutex::tGuard guard(responsesLock_, status);
     if (status.failed()) {
         return nullptr;
@@ -140,7 +141,8 @@ std::unique_ptr<tManagementMessage> tMgmtMsgTransceiver::takeResponse(std::uint1
     if (found == responses_.end() || found->first != sequenceId) {
         return nullptr;
     }
-    std::unique_ptr<tManagementMessage> message = std::move(found->second);
+    std::unique_ptr<tManagementMessage> message = std::move(found->second.message);
+    arrivedOn = found->second.arrivedOn;
     responses_.erase(found);
     return message;
 }
@@ -213,9 +215,9 @@ bool tMgmtMsgTransceiver::matches(const tPTPMessage& message, tStatus& status) c
 
 // Matches and stores under pendingLock_, so that retireRequest sees either no answer or
 // a stored one, never one in between.
-void tMgmtMsgTransceiver::store(std::unique_ptr<tManagementMessage> message, tStatus& status) {
+void tMgmtMsgTransceiver::store(tResponse response, tStatus& status) {
     nQVTARN000::tMutex::tGuard pending(pendingLock_, status);
-    if (!matches(*message, status)) {
+    if (!matches(*response.message, status)) {
         return;
     }
     {
@@ -223,9 +225,9 @@ void tMgmtMsgTransceiver::store(std::unique_ptr<tManagementMessage> message, tSt
         if (status.failed()) {
             return;
         }
-        const std::uint16_t sequenceId = message->getHeader()->getSequenceId();
+        const std::uint16_t sequenceId = response.message->getHeader()->getSequenceId();
         try {
-            responses_.emplace(sequenceId, std::move(message));
+            responses_.emplace(sequenceId, std::move(response));
         } catch (const std::bad_alloc&) {
             return;  // lost like a dropped datagram: its exchange times out
         }
@@ -274,7 +276,7 @@ void tMgmtMsgTransceiver::run(tStatus& status) {
         }
         std::unique_ptr<tManagementMessage> management(
             static_cast<tManagementMessage*>(message.release()));
-        store(std::move(management), status);
+        store({std::move(management), transport_->getReceiveInterface()}, status);
     }
 }
 

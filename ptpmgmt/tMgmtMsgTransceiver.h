@@ -44,10 +44,21 @@ class tMgmtMsgTransceiver final : public nQVTARN000::iThread {
 
     // Gives `message` the next sequence id, encodes and sends it; returns that id (also when
     // sending failed: the caller tests the status). The message stays the caller's.
-    std::uint16_t sendRequest(nQVPTP000::tManagementMessage& message, tStatus& status);
+    std::uint16_t sendRequest(nQVPTP000::tManagementMessage& message, tStatus& status) {
+        return sendRequest(message, nQVPTP000::kEveryInterface, status);
+    }
+    // The same through one interface of the transport (see iPTPPortMessaging).
+    std::uint16_t sendRequest(nQVPTP000::tManagementMessage& message,
+                              nQVPTP000::tInterfaceIndex via, tStatus& status);
     // The earliest stored answer with that sequence id, now owned by the caller, or null.
     std::unique_ptr<nQVPTP000::tManagementMessage> takeResponse(std::uint16_t sequenceId,
-                                                                tStatus& status);
+                                                                tStatus& status) {
+        nQVPTP000::tInterfaceIndex unused = nQVPTP000::kEveryInterface;
+        return takeResponse(sequenceId, unused, status);
+    }
+    // The same, and the interface on which it came in.
+    std::unique_ptr<nQVPTP000::tManagementMessage> takeResponse(
+        std::uint16_t sequenceId, nQVPTP000::tInterfaceIndex& arrivedOn, tStatus& status);
     // Later answers to that sequence id are dropped on arrival; stored ones stay.
     void cancelRequest(std::uint16_t sequenceId, tStatus& status);
     // Cancels and drops the answers already stored, so that late answers to a request whose
@@ -74,7 +85,12 @@ class tMgmtMsgTransceiver final : public nQVTARN000::iThread {
 
   private:
     bool matches(const nQVPTP000::tPTPMessage& message, tStatus& status) const;
-    void store(std::unique_ptr<nQVPTP000::tManagementMessage> message, tStatus& status);
+    struct tResponse {
+        std::unique_ptr<nQVPTP000::tManagementMessage> message;
+        nQVPTP000::tInterfaceIndex arrivedOn;
+    };
+
+    void store(tResponse response, tStatus& status);
     void noteReceiveError(tStatus& threadStatus);
     // Drops the id from the awaited ones and, when `storedToo`, its stored answers.
     void forget(std::uint16_t sequenceId, bool storedToo, tStatus& status);
@@ -89,7 +105,7 @@ class tMgmtMsgTransceiver final : public nQVTARN000::iThread {
     nQVTARN000::tMutex sendLock_;
     tStatus threadStatus_;
     // Answers not yet taken, in arrival order per sequence id; guarded by responsesLock_.
-    std::multimap<std::uint16_t, std::unique_ptr<nQVPTP000::tManagementMessage>> responses_;
+    std::multimap<std::uint16_t, tResponse> responses_;
     std::vector<std::uint16_t> pendingSequenceIds_;  // guarded by pendingLock_
     mutable nQVTARN000::tMutex responsesLock_;
     nQVTARN000::tMutex pendingLock_;

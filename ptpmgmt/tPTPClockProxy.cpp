@@ -50,8 +50,11 @@ void copyTerminated(const tPTPText& text, char* buffer, std::uint16_t size, tSta
 }  // namespace
 
 tPTPClockProxy::tPTPClockProxy(tPTPMgmtNode* node, const tClockKey& key, tDescription description,
-                               tStatus& status)
-    : node_(node), target_(allOnesPortIdentity()), cachedDescription_(std::move(description)) {
+                               tInterfaceIndex via, tStatus& status)
+    : node_(node),
+      target_(allOnesPortIdentity()),
+      via_(via),
+      cachedDescription_(std::move(description)) {
     if (status.succeeded()) {
         target_ = portIdentityOf(key);
         const tMessageHeader* header =
@@ -66,6 +69,7 @@ iPTPClockProxy& tPTPClockProxy::assign(const iPTPClockProxy& other) {
             node_ = proxy->node_;
             domainNumber_.store(proxy->domainNumber_.load());
             timeout_ = proxy->timeout_;
+            via_ = proxy->via_;
         }
         target_ = other.getPortIdentity();
     }
@@ -89,7 +93,7 @@ std::unique_ptr<tManagementMessage> tPTPClockProxy::exchange(Make&& make, std::u
     }
     try {
         return node_->sendAndAwait(target_, make(), actionField, timeout_, domainNumber_.load(),
-                                   status);
+                                   via_, status);
     } catch (const std::bad_alloc&) {
         QV_STATUS_SET(status, kStatusNoMemory, kComponentMgmt);
         return nullptr;

@@ -16,6 +16,7 @@
 #include "ptp/TLVs/tUTCPropertiesTLV.h"
 #include "ptp/tManagementMessage.h"
 #include "ptp/tPortAddress.h"
+#include "ptp/transport/iPTPPortMessaging.h"
 #include "ptpmgmt/iPTPClockProxy.h"
 #include "ptpmgmt/tClockKey.h"
 
@@ -25,7 +26,8 @@ class tPTPMgmtNode;
 
 // Stands for one port of one remote clock found by discovery. Every remote operation is
 // one exchange through the node's sendAndAwait, addressed to this port in this clock's
-// domain with a 5000 ms time-out.
+// domain with a 5000 ms time-out, sent through the interface on which the port answered
+// discovery first.
 //
 // The cached clock description is shared with the node, so that a discovery replacing it
 // never pulls it away from under a reader on another thread.
@@ -35,7 +37,7 @@ class tPTPClockProxy final : public iPTPClockProxy {
     using tDescription = std::shared_ptr<nQVPTP000::tManagementMessage>;
 
     tPTPClockProxy(tPTPMgmtNode* node, const tClockKey& key, tDescription description,
-                   tStatus& status);
+                   nQVPTP000::tInterfaceIndex via, tStatus& status);
 
     iPTPClockProxy& assign(const iPTPClockProxy& other) override;
     const nQVPTP000::tPortIdentity& getPortIdentity() const override { return target_; }
@@ -107,6 +109,7 @@ class tPTPClockProxy final : public iPTPClockProxy {
     nQVPTP000::tPortAddress getProtocolAddress() const override;
     nQVPTP000::tClockDescriptionTLV refreshClockDescription(tStatus& status) override;
 
+    nQVPTP000::tInterfaceIndex getInterface() const { return via_; }
     // Used by the node when a later discovery brings a newer description of this port.
     void setCachedDescription(tDescription description);
     // Only the client's own tests call this, to keep failing exchanges short; in use every
@@ -143,6 +146,7 @@ class tPTPClockProxy final : public iPTPClockProxy {
     nQVPTP000::tPortIdentity target_;
     tClockKey clockKey_{};
     std::uint16_t timeout_ = kTimeoutMs;
+    nQVPTP000::tInterfaceIndex via_ = nQVPTP000::kEveryInterface;
     std::atomic<std::uint8_t> domainNumber_{0};
     mutable std::mutex cacheLock_;
     tDescription cachedDescription_;  // guarded by cacheLock_

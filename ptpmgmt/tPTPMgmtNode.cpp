@@ -41,10 +41,11 @@ void tPTPMgmtNode::close(tStatus& status) {
     transceiver_.stop(status);
 }
 
-std::unique_ptr<tManagementMessage> tPTPMgmtNode::discoveryRequest(tStatus& status) const {
+std::unique_ptr<tManagementMessage> tPTPMgmtNode::discoveryRequest(
+    const nQVPTP000::tPortIdentity& target, tStatus& status) const {
     auto request = std::make_unique<tManagementMessage>(status);
     request->setActionField(tManagementMessagePayload::kGet, status);
-    request->setTargetPortIdentity(nQVPTP000::allOnesPortIdentity(), status);
+    request->setTargetPortIdentity(target, status);
     request->setPayload(std::make_unique<nQVPTP000::tClockDescriptionTLV>(), status);
     if (nQVPTP000::tMessageHeader* header = request->getHeader()) {
         header->setDomainNumber(0, status);
@@ -74,23 +75,11 @@ void tPTPMgmtNode::discover(std::uint8_t domains, std::uint16_t timeoutMs, tStat
 // Sends the request in domains 0 .. domains - 1 with consecutive sequence ids, lets the
 // receive thread collect answers for `timeoutMs`, then makes a proxy of every new port.
 void tPTPMgmtNode::sendAndCollect(std::uint8_t domains, std::uint16_t timeoutMs, tStatus& status) {
-    std::unique_ptr<tManagementMessage> request = discoveryRequest(status);
-    std::vector<std::uint16_t> sent;
-    sent.reserve(domains);
+    std::unique_ptr<tManagementMessage> request =
+        discoveryRequest(nQVPTP000::allOnesPortIdentity(), status);
     tMutex::tGuard clockList(clockListLock_, status);
-    {
-        tMutex::tGuard requests(requestLock_, status);
-        for (std::uint8_t domain = 0; domain < domains && status.succeeded(); ++domain) {
-            request->getHeader()->setDomainNumber(domain, status);
-            const std::uint16_t sequenceId = transceiver_.sendRequest(*request, status);
-            if (status.succeeded()) {
-                sent.push_back(sequenceId);
-                if (domains > 1) {
-                    std::this_thread::sleep_for(std::chrono::milliseconds(1));
-                }
-            }
-        }
-    }
+    const std::vector<std::uint16_t> sent =
+        sendInDomains(*request, domains, std::chrono::milliseconds(domains > 1 ? 1 : 0), status);
     if (status.succeeded()) {
         std::this_thread::sleep_for(std::chrono::milliseconds(timeoutMs));
     }
@@ -99,30 +88,119 @@ void tPTPMgmtNode::sendAndCollect(std::uint8_t domains, std::uint16_t timeoutMs,
         collect(sequenceId, status);
     }
     // A discovery that failed part-way must not leave requests that keep storing answers.
-    for (std::uint16_t sequenceId : sent) {
+    retire(sent);
+}
+
+// The request in domains 0 .. domains - 1 under requestLock_, so that the sequence ids are
+// consecutive; the ids of those that went out.
+std::vector<std::uint16_t> tPTPMgmtNode::sendInDomains(tManagementMessage& request,
+                                                       std::uint8_t domains,
+                                                       std::chrono::milliseconds pause,
+                                                       tStatus& status) {
+    std::vector<std::uint16_t> sent;
+    sent.reserve(domains);
+    tMutex::tGuard requests(requestLock_, status);
+    for (std::uint8_t domain = 0; domain < domains && status.succeeded(); ++domain) {
+        request.getHeader()->setDomainNumber(domain, status);
+        const std::uint16_t sequenceId = transceiver_.sendRequest(request, status);
+        if (status.succeeded()) {
+            sent.push_back(sequenceId);
+            std::this_thread::sleep_for(pause);
+        }
+    }
+    return sent;
+}
+
+void tPTPMgmtNode::retire(const std::vector<std::uint16_t>& sequenceIds) {
+    for (std::uint16_t sequenceId : sequenceIds) {
         tStatus scratch;
         transceiver_.retireRequest(sequenceId, scratch);
     }
 }
 
-// Turns the stored answers to one discovery request into proxies (clockListLock_ held).
-// A port already known keeps its proxy, which now describes itself by the newer answer.
-void tPTPMgmtNode::collect(std::uint16_t sequenceId, tStatus& status) {
+iPTPClockProxy* tPTPMgmtNode::askClock(const tClockKey& key, std::uint16_t timeoutMs,
+                                       tStatus& status) {
     try {
-        for (std::unique_ptr<tManagementMessage> answer =
-                 transceiver_.takeResponse(sequenceId, status);
-             answer && status.succeeded(); answer = transceiver_.takeResponse(sequenceId, status)) {
-            const tClockKey key = makeClockKey(answer->getHeader()->getSourcePortIdentity());
-            tDescription description(std::move(answer));
-            descriptions_[key] = description;
-            auto known = clocks_.find(key);
-            if (known != clocks_.end()) {
-                known->second->setCachedDescription(description);
-            } else {
-                clocks_.emplace(key,
-                                std::make_unique<tPTPClockProxy>(this, key, description, status));
-                clockCount_.store(static_cast<std::uint16_t>(clocks_.size()));
+        return askAndKeep(key, timeoutMs, status);
+    } catch (const std::bad_alloc&) {
+        QV_STATUS_SET(status, kStatusNoMemory, kComponentMgmt);
+        return nullptr;
+    }
+}
+
+// No pause between the requests: one port answers in its own domain only. The wait holds
+// no lock of the node, so exchanges and other lookups go on meanwhile.
+iPTPClockProxy* tPTPMgmtNode::askAndKeep(const tClockKey& key, std::uint16_t timeoutMs,
+                                         tStatus& status) {
+    std::unique_ptr<tManagementMessage> request = discoveryRequest(portIdentityOf(key), status);
+    const std::vector<std::uint16_t> sent =
+        sendInDomains(*request, kDiscoveryDomains, std::chrono::milliseconds(0), status);
+    std::vector<tAnswer> answers = awaitAnswerOf(key, sent, timeoutMs, status);
+    retire(sent);
+    tMutex::tGuard clockList(clockListLock_, status);
+    for (tAnswer& answer : answers) {
+        keep(std::move(answer), status);
+    }
+    if (status.failed()) {
+        return nullptr;  // also when the lock was not taken
+    }
+    const auto found = clocks_.find(key);
+    return found != clocks_.end() ? found->second.get() : nullptr;
+}
+
+// Takes the answers to `sequenceIds` as they come, until one is from `key` or the time is
+// up; the others (another port that took the request for its own) are kept too.
+std::vector<tPTPMgmtNode::tAnswer> tPTPMgmtNode::awaitAnswerOf(
+    const tClockKey& key, const std::vector<std::uint16_t>& sequenceIds, std::uint16_t timeoutMs,
+    tStatus& status) {
+    const auto deadline = tMgmtMsgTransceiver::tClock::now() + std::chrono::milliseconds(timeoutMs);
+    std::vector<tAnswer> answers;
+    bool answered = false;
+    while (status.succeeded() && !sequenceIds.empty()) {
+        const std::uint64_t seen = transceiver_.arrivals();
+        for (std::uint16_t sequenceId : sequenceIds) {
+            tAnswer answer{nullptr, nQVPTP000::kEveryInterface};
+            while ((answer.message = transceiver_.takeResponse(sequenceId, answer.arrivedOn,
+                                                               status)) != nullptr) {
+                answered =
+                    answered ||
+                    makeClockKey(answer.message->getHeader()->getSourcePortIdentity()) == key;
+                answers.push_back(std::move(answer));
             }
+        }
+        if (answered || tMgmtMsgTransceiver::tClock::now() >= deadline) {
+            break;
+        }
+        transceiver_.awaitArrival(seen, deadline);
+    }
+    return answers;
+}
+
+// Turns the stored answers to one discovery request into proxies (clockListLock_ held).
+void tPTPMgmtNode::collect(std::uint16_t sequenceId, tStatus& status) {
+    tAnswer answer{nullptr, nQVPTP000::kEveryInterface};
+    while ((answer.message = transceiver_.takeResponse(sequenceId, answer.arrivedOn, status))) {
+        keep(std::move(answer), status);
+    }
+}
+
+// Enters one answer (clockListLock_ held). A port already known keeps its proxy, and the
+// interface through which it is reached, and now describes itself by the newer answer.
+void tPTPMgmtNode::keep(tAnswer answer, tStatus& status) {
+    if (status.failed()) {
+        return;  // the lock may not be held
+    }
+    try {
+        const tClockKey key = makeClockKey(answer.message->getHeader()->getSourcePortIdentity());
+        tDescription description(std::move(answer.message));
+        descriptions_[key] = description;
+        auto known = clocks_.find(key);
+        if (known != clocks_.end()) {
+            known->second->setCachedDescription(description);
+        } else {
+            clocks_.emplace(key, std::make_unique<tPTPClockProxy>(this, key, description,
+                                                                  answer.arrivedOn, status));
+            clockCount_.store(static_cast<std::uint16_t>(clocks_.size()));
         }
     } catch (const std::bad_alloc&) {
         QV_STATUS_SET(status, kStatusNoMemory, kComponentMgmt);
@@ -182,7 +260,7 @@ void tPTPMgmtNode::removeClock(iPTPClockProxy* proxy, tStatus& status) {
 std::unique_ptr<tManagementMessage> tPTPMgmtNode::sendAndAwait(
     const nQVPTP000::tPortIdentity& target, std::unique_ptr<tManagementMessagePayload> payload,
     std::uint32_t actionField, std::uint16_t timeoutMs, std::uint8_t domainNumber,
-    tStatus& status) {
+    nQVPTP000::tInterfaceIndex via, tStatus& status) {
     tManagementMessage request(status);
     request.setActionField(actionField, status);
     request.setTargetPortIdentity(target, status);
@@ -197,7 +275,7 @@ std::unique_ptr<tManagementMessage> tPTPMgmtNode::sendAndAwait(
     std::uint16_t sequenceId = 0;
     {
         tMutex::tGuard requests(requestLock_, status);
-        sequenceId = transceiver_.sendRequest(request, status);
+        sequenceId = transceiver_.sendRequest(request, via, status);
     }
     if (status.failed()) {
         return nullptr;

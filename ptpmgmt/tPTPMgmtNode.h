@@ -2,6 +2,7 @@
 #define QV_PTPMGMT_TPTPMGMTNODE_H
 
 #include <atomic>
+#include <chrono>
 #include <cstdint>
 #include <map>
 #include <memory>
@@ -21,7 +22,8 @@ class tPTPClockProxy;
 // CLOCK_DESCRIPTION, keeps one proxy per answering port, and carries out every
 // request/response exchange that a proxy asks for.
 //
-// Lock order: clockListLock_, then requestLock_, then the transceiver's locks.
+// Lock order: clockListLock_, then requestLock_, then the transceiver's locks. askClock
+// sends under requestLock_ alone and takes clockListLock_ only once its wait is over.
 class tPTPMgmtNode final : public iPTPMgmtNode {
   public:
     static constexpr std::uint8_t kDiscoveryDomains = 4;
@@ -35,7 +37,14 @@ class tPTPMgmtNode final : public iPTPMgmtNode {
     tPTPMgmtNode& operator=(const tPTPMgmtNode&) = delete;
 
     // Discovery in domains 0 to 3: four requests, then `timeoutMs` of collecting answers.
+    // A port that answers on several interfaces is one clock, reached through the interface
+    // of its first answer.
     void findClocks(std::uint16_t timeoutMs, tStatus& status);
+    // Asks one port, as discovery asks all: the GET of CLOCK_DESCRIPTION addressed to `key`
+    // in domains 0 to 3, on every interface. Returns its proxy as soon as it has answered
+    // (a new port is kept as discovery keeps it, beside the clocks known), or null without
+    // an error when it did not answer within `timeoutMs`.
+    iPTPClockProxy* askClock(const tClockKey& key, std::uint16_t timeoutMs, tStatus& status);
     void findClocksInDefaultDomain(std::uint16_t timeoutMs, tStatus& status) override;
     std::uint16_t clockCount() const override;
     void copyClockProxies(iPTPClockProxy** proxies, std::uint16_t count, tStatus& status) override;
@@ -45,7 +54,8 @@ class tPTPMgmtNode final : public iPTPMgmtNode {
     void close(tStatus& status) override;
 
     // One checked exchange: sends `payload` (now owned by the request) with `actionField` to
-    // `target` in `domainNumber` and returns the answer, owned by the caller, once it has
+    // `target` in `domainNumber` through the interface `via` (kEveryInterface: every one)
+    // and returns the answer, owned by the caller, once it has
     // passed the checks: no error status, RESPONSE to GET or SET and ACKNOWLEDGE to COMMAND,
     // the same management id. Fails with -52012 when no answer came within the time-out
     // (ceil(timeoutMs / 50) steps of 50 ms) or the answer failed a check; the status's
@@ -53,18 +63,34 @@ class tPTPMgmtNode final : public iPTPMgmtNode {
     std::unique_ptr<nQVPTP000::tManagementMessage> sendAndAwait(
         const nQVPTP000::tPortIdentity& target,
         std::unique_ptr<nQVPTP000::tManagementMessagePayload> payload, std::uint32_t actionField,
-        std::uint16_t timeoutMs, std::uint8_t domainNumber, tStatus& status);
+        std::uint16_t timeoutMs, std::uint8_t domainNumber, nQVPTP000::tInterfaceIndex via,
+        tStatus& status);
 
     const nQVPTP000::tPortIdentity& getPortIdentity() const { return portIdentity_; }
     const tMgmtMsgTransceiver& getTransceiver() const { return transceiver_; }
 
   private:
     using tDescription = std::shared_ptr<nQVPTP000::tManagementMessage>;
+    // A discovery answer and the interface it came in on.
+    struct tAnswer {
+        std::unique_ptr<nQVPTP000::tManagementMessage> message;
+        nQVPTP000::tInterfaceIndex arrivedOn;
+    };
 
-    std::unique_ptr<nQVPTP000::tManagementMessage> discoveryRequest(tStatus& status) const;
+    std::unique_ptr<nQVPTP000::tManagementMessage> discoveryRequest(
+        const nQVPTP000::tPortIdentity& target, tStatus& status) const;
     void discover(std::uint8_t domains, std::uint16_t timeoutMs, tStatus& status);
     void sendAndCollect(std::uint8_t domains, std::uint16_t timeoutMs, tStatus& status);
+    std::vector<std::uint16_t> sendInDomains(nQVPTP000::tManagementMessage& request,
+                                             std::uint8_t domains, std::chrono::milliseconds pause,
+                                             tStatus& status);
+    iPTPClockProxy* askAndKeep(const tClockKey& key, std::uint16_t timeoutMs, tStatus& status);
+    std::vector<tAnswer> awaitAnswerOf(const tClockKey& key,
+                                       const std::vector<std::uint16_t>& sequenceIds,
+                                       std::uint16_t timeoutMs, tStatus& status);
+    void retire(const std::vector<std::uint16_t>& sequenceIds);
     void collect(std::uint16_t sequenceId, tStatus& status);
+    void keep(tAnswer answer, tStatus& status);
     std::unique_ptr<nQVPTP000::tManagementMessage> await(
         std::uint16_t sequenceId, const nQVPTP000::tManagementMessage& request,
         std::uint16_t timeoutMs, tStatus& status);

@@ -13,11 +13,12 @@
 #include "ptpmgmt/iPTPClockProxy.h"
 #include "ptpmgmt/tPTPMgmtNode.h"
 
-// The clock ports of the last successful discovery, as the expert hands them out. The
-// proxies belong to the node; this list only borrows them.
+// The clock ports of the last successful discovery, and those asked for by name since, as
+// the expert hands them out. The proxies belong to the node; this list only borrows them.
 //
-// Discovery runs under the named find mutex, so that one process at a time sends its
-// requests. The array is replaced and read only under `lock_`: a thread collecting names
+// Discovery and the lookup by name run under the named find mutex, so that one process at
+// a time sends its requests (and one thread at a time counts and copies the node's
+// clocks). The array is replaced and read only under `lock_`: a thread collecting names
 // never walks an array that another thread's discovery is replacing.
 class CPtpClockList {
   public:
@@ -30,6 +31,12 @@ class CPtpClockList {
     // when the find mutex cannot be taken) the previous array stays.
     bool refresh(nQVPTPMGMT000::tPTPMgmtNode& node, std::uint16_t timeoutMs, tStatus& status);
 
+    // Asks the port that `name` names (tPTPMgmtNode::askClock) and waits at most `timeoutMs`
+    // for it. `found` is its proxy, now in the array beside the others, or null when the
+    // name does not parse or no port answered. False when the lookup itself failed.
+    bool ask(nQVPTPMGMT000::tPTPMgmtNode& node, std::u16string_view name, std::uint16_t timeoutMs,
+             nQVPTPMGMT000::iPTPClockProxy*& found, tStatus& status);
+
     // One item name per clock port, in the node's key order.
     std::list<std::u16string> names() const;
 
@@ -39,6 +46,9 @@ class CPtpClockList {
                                                  std::u16string_view name);
 
   private:
+    // The array from the node's clocks (find mutex held).
+    bool copyFrom(nQVPTPMGMT000::tPTPMgmtNode& node, tStatus& status);
+
     qv::dsc::osdep::Mutex findMutex_;
     mutable std::mutex lock_;
     std::vector<nQVPTPMGMT000::iPTPClockProxy*> proxies_;  // guarded by lock_

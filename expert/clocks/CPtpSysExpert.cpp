@@ -15,6 +15,7 @@
 #include "expert/clocks/CPtpAttributeWriter.h"
 #include "expert/clocks/CPtpLastFailure.h"
 #include "platform/BStr.h"
+#include "platform/DiscoveryInterfaces.h"
 #include "platform/EthernetAdapters.h"
 #include "platform/FindClocksTimeout.h"
 
@@ -101,6 +102,9 @@ HRESULT CPtpSysExpert::Initialize() {
         if (ownedNode_) {
             return QV_E_ALREADY_INITIALIZED;
         }
+        if (!chooseInterfaces()) {
+            return E_FAIL;
+        }
         const auto portNumber = static_cast<std::uint16_t>(::getpid() & 0xFFFF);
         const auto identity = qv::dsc::osdep::EthernetAdapters::localClockIdentity();
         tStatus status;
@@ -131,6 +135,24 @@ HRESULT CPtpSysExpert::Shutdown() {
         ownedNode_->close(status);
         return status.failed() ? E_FAIL : S_OK;
     });
+}
+
+// The interfaces that the setting names, for the UDP interface to open on; none without it.
+// A name that is no interface able to multicast fails, rather than searching nowhere.
+bool CPtpSysExpert::chooseInterfaces() {
+    using qv::dsc::osdep::DiscoveryInterfaces;
+    std::string unknown;
+    auto chosen = DiscoveryInterfaces::choose(DiscoveryInterfaces::read(),
+                                              qv::dsc::osdep::MulticastInterfaces::list(), unknown);
+    if (!unknown.empty()) {
+        const std::string what = "the interface '" + unknown + "' named in the setting \"" +
+                                 DiscoveryInterfaces::kValueName +
+                                 "\" is not up, has no IPv4 address or cannot multicast";
+        CPtpLastFailure::record(what.c_str(), tStatus());
+        return false;
+    }
+    udp_.useInterfaces(std::move(chosen));
+    return true;
 }
 
 bool CPtpSysExpert::refreshClockList() {
@@ -225,13 +247,16 @@ HRESULT CPtpSysExpert::GetItem(const OLECHAR* name, IkxSysPropertyBag** item) {
             return E_NOT_VALID_STATE;
         }
         const std::u16string itemName = textOf(name);
-        if (CPtpClockList::lookup(*node, itemName) == nullptr) {
-            if (!refreshClockList()) {
-                return E_FAIL;
-            }
-            if (CPtpClockList::lookup(*node, itemName) == nullptr) {
-                return CORBEL_E_ITEM_NOT_FOUND;
-            }
+        // An unknown name is asked for by name: the answer ends the wait.
+        iPTPClockProxy* proxy = CPtpClockList::lookup(*node, itemName);
+        tStatus status;
+        if (proxy == nullptr &&
+            !clocks_.ask(*node, itemName, discoveryTimeout_.load(), proxy, status)) {
+            CPtpLastFailure::record("looking up the item by name", status);
+            return E_FAIL;
+        }
+        if (proxy == nullptr) {
+            return CORBEL_E_ITEM_NOT_FOUND;
         }
         IkxSysPropertyBag2* bag = nullptr;
         const HRESULT result = itemBag(itemName, &bag);

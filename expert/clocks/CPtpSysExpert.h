@@ -67,10 +67,11 @@ class CPtpSysExpert : public IkxSysExpert2,
 
   private:
     nQVPTPMGMT000::tPTPMgmtNode* openNode() const { return node_.load(std::memory_order_acquire); }
+    bool chooseInterfaces();
     bool refreshClockList();
     HRESULT itemBag(const std::u16string& name, IkxSysPropertyBag2** bag);
 
-    nQVPTP000::tUDPNetworkInterface udp_;
+    nQVPTP000::tUDPNetworkInterface udp_;  // its interfaces chosen by Initialize (lifeLock_)
     nQVPTP000::iPTPPortMessaging* transport_ = &udp_;  // guarded by lifeLock_
     std::mutex lifeLock_;
     std::unique_ptr<nQVPTPMGMT000::tPTPMgmtNode> ownedNode_;   // guarded by lifeLock_

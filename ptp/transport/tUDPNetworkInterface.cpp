@@ -25,6 +25,31 @@ bool setOption(int fd, int level, int name, const T& value) {
     return setsockopt(fd, level, name, &value, sizeof(value)) == 0;
 }
 
+// One datagram into `buffer`, and the interface it came in on. MSG_TRUNC answers the
+// datagram's full length, so an oversized one is noticed instead of being cut silently; it
+// is consumed either way.
+ssize_t receiveFrom(int fd, std::uint8_t (&buffer)[tUDPNetworkInterface::kMaxDatagram],
+                    tInterfaceIndex& arrivedOn) {
+    iovec data{buffer, sizeof(buffer)};
+    alignas(cmsghdr) char control[CMSG_SPACE(sizeof(in_pktinfo))];
+    msghdr message{};
+    message.msg_iov = &data;
+    message.msg_iovlen = 1;
+    message.msg_control = control;
+    message.msg_controllen = sizeof(control);
+    const ssize_t length = recvmsg(fd, &message, MSG_TRUNC);
+    arrivedOn = kEveryInterface;
+    for (cmsghdr* item = CMSG_FIRSTHDR(&message); length >= 0 && item != nullptr;
+         item = CMSG_NXTHDR(&message, item)) {
+        if (item->cmsg_level == IPPROTO_IP && item->cmsg_type == IP_PKTINFO) {
+            in_pktinfo info{};
+            std::memcpy(&info, CMSG_DATA(item), sizeof(info));
+            arrivedOn = static_cast<tInterfaceIndex>(info.ipi_ifindex);
+        }
+    }
+    return length;
+}
+
 void closeIfValid(std::atomic<int>& fd) {
     const int old = fd.exchange(-1);
     if (old >= 0) {
@@ -56,19 +81,28 @@ void tUDPNetworkInterface::open(tStatus& status) {
             return;
         }
     }
-    sendSocket_ = newUdpSocket(0);
-    if (sendSocket_.load() < 0) {
-        QV_STATUS_SET(status, kStatusOsObjectError, kComponentCodec);
-        return;
-    }
-    in_addr outgoing{};
-    outgoing.s_addr = localInterfaceAddress_;
-    if (!setOption(sendSocket_.load(), IPPROTO_IP, IP_MULTICAST_IF, outgoing)) {
-        QV_STATUS_SET(status, kStatusSocketError, kComponentCodec);
-        return;
-    }
+    openSendSockets(status);
     eventSocket_ = openReceiveSocket(kEventPort, status);
     generalSocket_ = openReceiveSocket(kGeneralPort, status);
+}
+
+// One socket per interface, its outgoing multicast interface set to that interface.
+void tUDPNetworkInterface::openSendSockets(tStatus& status) {
+    const std::lock_guard<std::mutex> guard(sendLock_);
+    for (const auto& interface : interfacesToOpen()) {
+        const int fd = newUdpSocket(0);
+        if (fd < 0) {
+            QV_STATUS_SET(status, kStatusOsObjectError, kComponentCodec);
+            return;
+        }
+        sendSockets_.push_back({interface.index, fd});
+        in_addr outgoing{};
+        outgoing.s_addr = interface.address;
+        if (!setOption(fd, IPPROTO_IP, IP_MULTICAST_IF, outgoing)) {
+            QV_STATUS_SET(status, kStatusSocketError, kComponentCodec);
+            return;
+        }
+    }
 }
 
 int tUDPNetworkInterface::openReceiveSocket(std::uint16_t port, tStatus& status) {
@@ -85,41 +119,46 @@ int tUDPNetworkInterface::openReceiveSocket(std::uint16_t port, tStatus& status)
     local.sin_family = AF_INET;
     local.sin_port = htons(port);
     local.sin_addr.s_addr = localInterfaceAddress_;
-    ip_mreq membership{};
-    membership.imr_multiaddr.s_addr = groupAddress_;
-    membership.imr_interface.s_addr = localInterfaceAddress_;
     // The larger buffer is a wish, not a need: beyond the system's limit only a privileged
     // process may go (SO_RCVBUFFORCE), and a smaller buffer still works.
     if (!setOption(fd, SOL_SOCKET, SO_RCVBUFFORCE, kReceiveBufferOctets)) {
         setOption(fd, SOL_SOCKET, SO_RCVBUF, kReceiveBufferOctets);
     }
-    if (!setOption(fd, SOL_SOCKET, SO_REUSEADDR, 1) ||
-        bind(fd, reinterpret_cast<const sockaddr*>(&local), sizeof(local)) != 0 ||
-        !setOption(fd, IPPROTO_IP, IP_ADD_MEMBERSHIP, membership)) {
+    // IP_PKTINFO: each datagram tells on which interface it came in.
+    bool configured = setOption(fd, SOL_SOCKET, SO_REUSEADDR, 1) &&
+                      setOption(fd, IPPROTO_IP, IP_PKTINFO, 1) &&
+                      bind(fd, reinterpret_cast<const sockaddr*>(&local), sizeof(local)) == 0;
+    for (const auto& interface : interfacesToOpen()) {
+        ip_mreq membership{};
+        membership.imr_multiaddr.s_addr = groupAddress_;
+        membership.imr_interface.s_addr = interface.address;
+        configured = configured && setOption(fd, IPPROTO_IP, IP_ADD_MEMBERSHIP, membership);
+    }
+    if (!configured) {
         QV_STATUS_SET(status, kStatusSocketError, kComponentCodec);
     }
     return fd;  // kept, like every socket of a failed open, until close
 }
 
 void tUDPNetworkInterface::closeSockets() {
-    closeIfValid(sendSocket_);
+    {
+        const std::lock_guard<std::mutex> guard(sendLock_);
+        for (const tSendSocket& socket : sendSockets_) {
+            ::close(socket.fd);
+        }
+        sendSockets_.clear();
+    }
     closeIfValid(eventSocket_);
     closeIfValid(generalSocket_);
 }
 
-void tUDPNetworkInterface::sendTo(std::uint16_t port, const tProtocolDataUnit& unit,
-                                  tStatus& status) {
-    if (status.failed()) {
-        return;
-    }
+bool tUDPNetworkInterface::sendDatagram(int fd, std::uint16_t port, const tProtocolDataUnit& unit) {
     sockaddr_in target{};
     target.sin_family = AF_INET;
     target.sin_addr.s_addr = groupAddress_;
     target.sin_port = htons(port);
-    if (sendto(sendSocket_.load(), unit.getBuffer(), unit.getLength(), 0,
-               reinterpret_cast<const sockaddr*>(&target), sizeof(target)) < 0) {
-        QV_STATUS_SET(status, kStatusSocketError, kComponentCodec);
-    }
+    return sendto(fd, unit.getBuffer(), unit.getLength(), 0,
+                  reinterpret_cast<const sockaddr*>(&target), sizeof(target)) >= 0;
 }
 
 void tUDPNetworkInterface::receive(tProtocolDataUnit& unit, tStatus& status) {
@@ -134,9 +173,7 @@ void tUDPNetworkInterface::receive(tProtocolDataUnit& unit, tStatus& status) {
     }
     std::uint8_t buffer[kMaxDatagram];
     for (;;) {
-        // MSG_TRUNC answers the datagram's full length, so an oversized one is noticed
-        // instead of being cut silently; it is consumed either way.
-        const ssize_t length = recv(readySocket, buffer, sizeof(buffer), MSG_TRUNC);
+        const ssize_t length = receiveFrom(readySocket, buffer, lastInterface_);
         if (reportAbort(status)) {
             return;  // a datagram read in this pass is dropped
         }

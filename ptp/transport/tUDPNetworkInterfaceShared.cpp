@@ -1,10 +1,11 @@
 #include "ptp/transport/tUDPNetworkInterface.h"
 
+#include <algorithm>
 #include <cstring>
 
 // The parts of the UDP interface that are the same on every system: padding of event
-// messages for compatible peers, the abort flag, and closing once no receive runs. The
-// sockets themselves are in tUDPNetworkInterface.cpp (POSIX) and
+// messages for compatible peers, the choice of send sockets, the abort flag, and closing
+// once no receive runs. The sockets themselves are in tUDPNetworkInterface.cpp (POSIX) and
 // tUDPNetworkInterfaceWin32.cpp (Winsock).
 namespace nQVPTP000 {
 
@@ -36,6 +37,38 @@ void tUDPNetworkInterface::close(tStatus&) {
     closing_ = false;
 }
 
+void tUDPNetworkInterface::useInterfaces(
+    std::vector<qv::dsc::osdep::MulticastInterface> interfaces) {
+    interfaces_ = std::move(interfaces);
+}
+
+std::vector<qv::dsc::osdep::MulticastInterface> tUDPNetworkInterface::interfacesToOpen() const {
+    if (!interfaces_.empty()) {
+        return interfaces_;
+    }
+    return {{"", kEveryInterface, localInterfaceAddress_}};
+}
+
+void tUDPNetworkInterface::sendTo(std::uint16_t port, const tProtocolDataUnit& unit,
+                                  tInterfaceIndex via, tStatus& status) {
+    if (status.failed()) {
+        return;
+    }
+    const std::lock_guard<std::mutex> guard(sendLock_);
+    const bool one = std::ranges::any_of(sendSockets_, [via](const tSendSocket& socket) {
+        return via != kEveryInterface && socket.index == via;
+    });
+    bool sent = false;
+    for (const tSendSocket& socket : sendSockets_) {
+        if (!one || socket.index == via) {
+            sent = sendDatagram(socket.fd, port, unit) || sent;
+        }
+    }
+    if (!sent) {
+        QV_STATUS_SET(status, kStatusSocketError, kComponentCodec);
+    }
+}
+
 void tUDPNetworkInterface::sendEventMessage(tProtocolDataUnit& unit, tStatus& status) {
     if (status.failed()) {
         return;
@@ -45,14 +78,19 @@ void tUDPNetworkInterface::sendEventMessage(tProtocolDataUnit& unit, tStatus& st
             unit.writeOctet(0, status);
         }
     }
-    sendTo(kEventPort, unit, status);
+    sendTo(kEventPort, unit, kEveryInterface, status);
 }
 
 void tUDPNetworkInterface::sendGeneralMessage(tProtocolDataUnit& unit, tStatus& status) {
     if (status.failed()) {
         return;
     }
-    sendTo(kGeneralPort, unit, status);
+    sendTo(kGeneralPort, unit, kEveryInterface, status);
+}
+
+void tUDPNetworkInterface::sendGeneralMessageVia(tProtocolDataUnit& unit, tInterfaceIndex via,
+                                                 tStatus& status) {
+    sendTo(kGeneralPort, unit, via, status);
 }
 
 void tUDPNetworkInterface::abortReceive(tStatus&) {

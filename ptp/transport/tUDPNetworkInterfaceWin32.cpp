@@ -1,5 +1,6 @@
 #include <winsock2.h>
-// After winsock2.h, which it needs.
+// After winsock2.h, which they need.
+#include <mswsock.h>
 #include <ws2tcpip.h>
 
 #include <cstring>
@@ -64,6 +65,50 @@ void closeIfValid(std::atomic<int>& fd) {
     }
 }
 
+// WSARecvMsg, the one receive that hands over IP_PKTINFO, is reached through a pointer
+// that the socket provider gives; null when it does not.
+LPFN_WSARECVMSG recvMsgOf(SOCKET handle) {
+    static const LPFN_WSARECVMSG function = [handle] {
+        GUID id = WSAID_WSARECVMSG;
+        LPFN_WSARECVMSG found = nullptr;
+        DWORD size = 0;
+        return WSAIoctl(handle, SIO_GET_EXTENSION_FUNCTION_POINTER, &id, sizeof(id), &found,
+                        sizeof(found), &size, nullptr, nullptr) == 0
+                   ? found
+                   : nullptr;
+    }();
+    return function;
+}
+
+// One datagram into `buffer`, and the interface it came in on (none when the provider does
+// not tell): the length, or SOCKET_ERROR.
+int receiveFrom(SOCKET handle, char* buffer, std::size_t size, tInterfaceIndex& arrivedOn) {
+    arrivedOn = kEveryInterface;
+    const LPFN_WSARECVMSG recvMsg = recvMsgOf(handle);
+    if (recvMsg == nullptr) {
+        return recv(handle, buffer, static_cast<int>(size), 0);
+    }
+    WSABUF data{static_cast<ULONG>(size), buffer};
+    alignas(WSACMSGHDR) char control[WSA_CMSG_SPACE(sizeof(IN_PKTINFO))] = {};
+    WSAMSG message{};
+    message.lpBuffers = &data;
+    message.dwBufferCount = 1;
+    message.Control = WSABUF{sizeof(control), control};
+    DWORD length = 0;
+    if (recvMsg(handle, &message, &length, nullptr, nullptr) != 0) {
+        return SOCKET_ERROR;
+    }
+    for (WSACMSGHDR* item = WSA_CMSG_FIRSTHDR(&message); item != nullptr;
+         item = WSA_CMSG_NXTHDR(&message, item)) {
+        if (item->cmsg_level == IPPROTO_IP && item->cmsg_type == IP_PKTINFO) {
+            IN_PKTINFO info{};
+            std::memcpy(&info, WSA_CMSG_DATA(item), sizeof(info));
+            arrivedOn = static_cast<tInterfaceIndex>(info.ipi_ifindex);
+        }
+    }
+    return static_cast<int>(length);
+}
+
 // A non-blocking datagram socket bound to an ephemeral loopback port.
 int newWakeSocket() {
     const int fd = newUdpSocket(true);
@@ -106,19 +151,28 @@ void tUDPNetworkInterface::open(tStatus& status) {
             return;
         }
     }
-    sendSocket_ = newUdpSocket(false);
-    if (sendSocket_.load() < 0) {
-        QV_STATUS_SET(status, kStatusOsObjectError, kComponentCodec);
-        return;
-    }
-    in_addr outgoing{};
-    outgoing.s_addr = localInterfaceAddress_;
-    if (!setOption(sendSocket_.load(), IPPROTO_IP, IP_MULTICAST_IF, outgoing)) {
-        QV_STATUS_SET(status, kStatusSocketError, kComponentCodec);
-        return;
-    }
+    openSendSockets(status);
     eventSocket_ = openReceiveSocket(kEventPort, status);
     generalSocket_ = openReceiveSocket(kGeneralPort, status);
+}
+
+// One socket per interface, its outgoing multicast interface set to that interface.
+void tUDPNetworkInterface::openSendSockets(tStatus& status) {
+    const std::lock_guard<std::mutex> guard(sendLock_);
+    for (const auto& interface : interfacesToOpen()) {
+        const int fd = newUdpSocket(false);
+        if (fd < 0) {
+            QV_STATUS_SET(status, kStatusOsObjectError, kComponentCodec);
+            return;
+        }
+        sendSockets_.push_back({interface.index, fd});
+        in_addr outgoing{};
+        outgoing.s_addr = interface.address;
+        if (!setOption(fd, IPPROTO_IP, IP_MULTICAST_IF, outgoing)) {
+            QV_STATUS_SET(status, kStatusSocketError, kComponentCodec);
+            return;
+        }
+    }
 }
 
 int tUDPNetworkInterface::openReceiveSocket(std::uint16_t port, tStatus& status) {
@@ -135,39 +189,45 @@ int tUDPNetworkInterface::openReceiveSocket(std::uint16_t port, tStatus& status)
     local.sin_family = AF_INET;
     local.sin_port = htons(port);
     local.sin_addr.s_addr = localInterfaceAddress_;
-    ip_mreq membership{};
-    membership.imr_multiaddr.s_addr = groupAddress_;
-    membership.imr_interface.s_addr = localInterfaceAddress_;
     // The larger buffer is a wish, not a need: a smaller one still works.
     setOption(fd, SOL_SOCKET, SO_RCVBUF, kReceiveBufferOctets);
-    if (!setOption(fd, SOL_SOCKET, SO_REUSEADDR, BOOL{TRUE}) ||
-        bind(handleOf(fd), reinterpret_cast<const sockaddr*>(&local), sizeof(local)) != 0 ||
-        !setOption(fd, IPPROTO_IP, IP_ADD_MEMBERSHIP, membership)) {
+    // IP_PKTINFO: each datagram tells on which interface it came in.
+    bool configured =
+        setOption(fd, SOL_SOCKET, SO_REUSEADDR, BOOL{TRUE}) &&
+        setOption(fd, IPPROTO_IP, IP_PKTINFO, DWORD{1}) &&
+        bind(handleOf(fd), reinterpret_cast<const sockaddr*>(&local), sizeof(local)) == 0;
+    for (const auto& interface : interfacesToOpen()) {
+        ip_mreq membership{};
+        membership.imr_multiaddr.s_addr = groupAddress_;
+        membership.imr_interface.s_addr = interface.address;
+        configured = configured && setOption(fd, IPPROTO_IP, IP_ADD_MEMBERSHIP, membership);
+    }
+    if (!configured) {
         QV_STATUS_SET(status, kStatusSocketError, kComponentCodec);
     }
     return fd;  // kept, like every socket of a failed open, until close
 }
 
 void tUDPNetworkInterface::closeSockets() {
-    closeIfValid(sendSocket_);
+    {
+        const std::lock_guard<std::mutex> guard(sendLock_);
+        for (const tSendSocket& socket : sendSockets_) {
+            closesocket(handleOf(socket.fd));
+        }
+        sendSockets_.clear();
+    }
     closeIfValid(eventSocket_);
     closeIfValid(generalSocket_);
 }
 
-void tUDPNetworkInterface::sendTo(std::uint16_t port, const tProtocolDataUnit& unit,
-                                  tStatus& status) {
-    if (status.failed()) {
-        return;
-    }
+bool tUDPNetworkInterface::sendDatagram(int fd, std::uint16_t port, const tProtocolDataUnit& unit) {
     sockaddr_in target{};
     target.sin_family = AF_INET;
     target.sin_addr.s_addr = groupAddress_;
     target.sin_port = htons(port);
-    if (sendto(handleOf(sendSocket_.load()), reinterpret_cast<const char*>(unit.getBuffer()),
-               static_cast<int>(unit.getLength()), 0, reinterpret_cast<const sockaddr*>(&target),
-               sizeof(target)) == SOCKET_ERROR) {
-        QV_STATUS_SET(status, kStatusSocketError, kComponentCodec);
-    }
+    return sendto(handleOf(fd), reinterpret_cast<const char*>(unit.getBuffer()),
+                  static_cast<int>(unit.getLength()), 0, reinterpret_cast<const sockaddr*>(&target),
+                  sizeof(target)) != SOCKET_ERROR;
 }
 
 void tUDPNetworkInterface::receive(tProtocolDataUnit& unit, tStatus& status) {
@@ -182,7 +242,8 @@ void tUDPNetworkInterface::receive(tProtocolDataUnit& unit, tStatus& status) {
     }
     static thread_local char buffer[kLargestDatagram];
     for (;;) {
-        const int length = recv(handleOf(readySocket), buffer, sizeof(buffer), 0);
+        const int length =
+            receiveFrom(handleOf(readySocket), buffer, sizeof(buffer), lastInterface_);
         const int error = length == SOCKET_ERROR ? WSAGetLastError() : 0;
         if (reportAbort(status)) {
             return;  // a datagram read in this pass is dropped

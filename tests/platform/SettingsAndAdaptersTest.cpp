@@ -5,10 +5,12 @@
 #include <fstream>
 #include <string>
 
+#include "platform/DiscoveryInterfaces.h"
 #include "platform/EthernetAdapters.h"
 #include "platform/FindClocksTimeout.h"
 #include "platform/SettingsStore.h"
 
+using qv::dsc::osdep::DiscoveryInterfaces;
 using qv::dsc::osdep::EthernetAdapters;
 using qv::dsc::osdep::FindClocksTimeout;
 using qv::dsc::osdep::SettingsStore;
@@ -27,10 +29,10 @@ class SettingsTest : public ::testing::Test {
         unsetenv(SettingsStore::kRootVariable);
         std::filesystem::remove_all(root_);
     }
-    void store(const std::string& text) {
+    void store(const std::string& text, const char* value = "findClocksTimeout") {
         const std::filesystem::path folder = root_ + "/Software/Quarvel/Corbel/qv-1588";
         std::filesystem::create_directories(folder);
-        std::ofstream(folder / "findClocksTimeout") << text;
+        std::ofstream(folder / value) << text;
     }
 
     std::string root_;
@@ -54,6 +56,31 @@ TEST_F(SettingsTest, TextThatIsNoNumberGivesTheDefault) {
     }
     const SettingsStore key(FindClocksTimeout::kKeyPath);
     EXPECT_FALSE(key.readNumber("../qv-1588/findClocksTimeout").has_value());
+}
+
+// Cases in pairs: a setting, then the names chosen, or "?" and the word that names none.
+TEST_F(SettingsTest, InterfacesComeFromTheVariableOrTheStoreAndAreChosenByNameOrIndex) {
+    store("br1\n", DiscoveryInterfaces::kValueName);
+    setenv(DiscoveryInterfaces::kVariable, "", 1);
+    EXPECT_EQ(DiscoveryInterfaces::read(), "br1\n");  // an empty variable counts as none
+    setenv(DiscoveryInterfaces::kVariable, "all", 1);
+    EXPECT_EQ(DiscoveryInterfaces::read(), "all");
+    unsetenv(DiscoveryInterfaces::kVariable);
+    const std::vector<qv::dsc::osdep::MulticastInterface> available = {
+        {"eth0", 2, 1}, {"eth1", 3, 2}, {"wlan0", 5, 3}};
+    const char* const cases[][2] = {{"", ""},
+                                    {"all", "eth0 eth1 wlan0 "},
+                                    {"wlan0,eth0", "eth0 wlan0 "},
+                                    {"5 eth0\t5", "eth0 wlan0 "},
+                                    {"eth0 eth9", "?eth9"},
+                                    {"99999999999", "?99999999999"}};
+    for (const auto& [setting, expected] : cases) {
+        std::string unknown, chosen;
+        for (const auto& interface : DiscoveryInterfaces::choose(setting, available, unknown)) {
+            chosen += interface.name + " ";
+        }
+        EXPECT_EQ(unknown.empty() ? chosen : "?" + unknown, expected) << setting;
+    }
 }
 
 TEST(EthernetAdaptersTest, ClockIdentityIsEui64OfTheAddress) {

@@ -45,9 +45,10 @@ class tPTPMgmtNodeTest : public ::testing::Test {
         ASSERT_TRUE(status_.succeeded());
     }
 
-    SimulatedClock& addClock(std::uint8_t last, std::uint16_t ports = 1, std::uint8_t domain = 0) {
+    SimulatedClock& addClock(std::uint8_t last, std::uint16_t ports = 1, std::uint8_t domain = 0,
+                             nQVPTP000::tInterfaceIndex on = nQVPTP000::kEveryInterface) {
         clocks_.push_back(std::make_unique<SimulatedClock>(clockIdentity(last), ports, domain));
-        network_.attach(*clocks_.back());
+        network_.attach(*clocks_.back(), on);
         return *clocks_.back();
     }
     std::vector<tPTPClockProxy*> proxies() {
@@ -65,7 +66,7 @@ class tPTPMgmtNodeTest : public ::testing::Test {
                                                  tStatus* status = nullptr) {
         return node_.sendAndAwait(tPortIdentity(clockIdentity(1), 1),
                                   std::make_unique<nQVPTP000::tPriority1TLV>(), action, timeoutMs,
-                                  0, status ? *status : status_);
+                                  0, nQVPTP000::kEveryInterface, status ? *status : status_);
     }
 
     tStatus status_;
@@ -136,6 +137,19 @@ TEST_F(tPTPMgmtNodeTest, ALaterDiscoveryRefreshesDescriptionsAndKeepsSilentClock
     EXPECT_TRUE(status_.succeeded());
 }
 
+// A port on two networks is one proxy, reached through the interface of its first answer.
+TEST_F(tPTPMgmtNodeTest, EachPortIsAskedThroughTheInterfaceItAnsweredOnFirst) {
+    network_.attach(addClock(1, 1, 0, 7), 9);
+    addClock(2, 1, 0, 9);
+    node_.findClocks(kDiscoveryMs, status_);
+    for (tPTPClockProxy* proxy : proxies()) {
+        proxy->getPriority1(status_);
+    }
+    const auto via = network_.sentVia();  // four discovery requests, then one per proxy
+    EXPECT_EQ(via, (std::vector<nQVPTP000::tInterfaceIndex>{0, 0, 0, 0, 7, 9}));
+    EXPECT_TRUE(status_.succeeded());
+}
+
 TEST_F(tPTPMgmtNodeTest, ADiscoveryWhoseSendFailsPartWayLeavesNothingAwaited) {
     addClock(1);
     network_.failSends(2, 1);  // domains 0 and 1 go out, domain 2 does not
@@ -172,7 +186,7 @@ TEST_F(tPTPMgmtNodeTest, AnswersThatDoNotFitTheRequestEndTheExchange) {
             tStatus status;
             EXPECT_FALSE(node_.sendAndAwait(tPortIdentity(clockIdentity(1), 1),
                                             std::make_unique<nQVPTP000::tNullManagementTLV>(),
-                                            action, 5000, 0, status));
+                                            action, 5000, 0, nQVPTP000::kEveryInterface, status));
             EXPECT_EQ(status.code, kStatusNoData) << "action " << action;
         }
     }

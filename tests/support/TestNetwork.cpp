@@ -52,7 +52,8 @@ TestClock clockOf(std::map<std::string, std::string>& words) {
                     static_cast<std::uint8_t>(number("domain")),
                     static_cast<std::uint8_t>(number("prio1")),
                     static_cast<std::uint8_t>(number("prio2")),
-                    words["desc"]};
+                    words["desc"],
+                    words["bridge"]};
     for (std::size_t i = 0; i < clock.identity.size() && words["identity"].size() == 16; ++i) {
         clock.identity[i] =
             static_cast<std::uint8_t>(std::stoul(words["identity"].substr(2 * i, 2), nullptr, 16));

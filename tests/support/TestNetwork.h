@@ -18,6 +18,7 @@ struct TestClock {
     std::uint16_t portNumber = 1;
     std::uint8_t domain = 0, priority1 = 128, priority2 = 128;
     std::string description;  // the user description that the clock reports
+    std::string bridge;       // the client's bridge it is on: "br0", or "br1" (net=1)
 };
 
 // What a command printed (stdout and stderr together) and how it ended.

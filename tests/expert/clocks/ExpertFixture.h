@@ -50,9 +50,8 @@ class ExpertFixture : public ::testing::Test {
     static void SetUpTestSuite() {
         char folder[] = "/tmp/qv-expert-XXXXXX";
         ASSERT_NE(::mkdtemp(folder), nullptr);
-        const auto key = std::filesystem::path(folder) / "Software/Quarvel/Corbel/qv-1588";
-        std::filesystem::create_directories(key);
-        std::ofstream(key / "findClocksTimeout") << "30\n";
+        key_ = std::filesystem::path(folder) / "Software/Quarvel/Corbel/qv-1588";
+        std::filesystem::create_directories(key_);
         ::setenv("QV_SETTINGS_ROOT", folder, 1);
         ::setenv("QV_LOCK_DIR", folder, 1);
     }
@@ -65,7 +64,9 @@ class ExpertFixture : public ::testing::Test {
     }
     ~ExpertFixture() override { expert->Shutdown(); }
 
-    static tExpert newExpert(nQVPTP000::iPTPPortMessaging& on) {
+    // An expert whose discovery waits `waitMs`.
+    static tExpert newExpert(nQVPTP000::iPTPPortMessaging& on, unsigned waitMs = 30) {
+        std::ofstream(key_ / "findClocksTimeout") << waitMs << '\n';
         CQVComObject<CPtpSysExpert>* created = nullptr;
         EXPECT_EQ(CQVComObject<CPtpSysExpert>::CreateInstance(&created), S_OK);
         tExpert held(created);
@@ -121,6 +122,7 @@ class ExpertFixture : public ::testing::Test {
         return ids;
     }
 
+    static inline std::filesystem::path key_;
     SimulatedNetwork network;
     SimulatedClock clock;
     InMemoryManagedClock& managed = clock.managed();

@@ -33,12 +33,12 @@ TEST_F(ExpertFixture, ListingsRefreshEveryTimeAndAnItemLookupOnlyForAnUnknownNam
         EXPECT_EQ(textOf(*bag.get(), kxQvClockPortName), "02-11-22-FF-FE-33-44-55:1");
     }
     EXPECT_EQ(newRequests(), tIds());
-    // A port number is 16 bits: these do not wrap to port 1 (each costs a refresh).
+    // A port number is 16 bits: these do not wrap to port 1, and name no port to ask.
     for (const char16_t* name : {u"02-11-22-FF-FE-33-44-55:65537",
                                  u"02-11-22-FF-FE-33-44-55:-65535", u"02-11-22-FF-FE-33-44-55"}) {
         EXPECT_EQ(expert->GetItem(name, bag.Receive()), CORBEL_E_ITEM_NOT_FOUND);
     }
-    EXPECT_EQ(newRequests().size(), 3 * kDiscovery.size());
+    EXPECT_EQ(newRequests(), tIds());
     SimulatedClock later(identity(0x56));
     network.attach(later);
     const kxSysAttributeTagID tag = kxQvPriority1;
@@ -52,6 +52,29 @@ TEST_F(ExpertFixture, ListingsRefreshEveryTimeAndAnItemLookupOnlyForAnUnknownNam
     auto lonely = newExpert(empty);
     EXPECT_EQ(lonely->GetItemNames(names.Receive()), S_FALSE);
     lonely->Shutdown();
+}
+
+// An unknown name is asked for by name alone, and its answer ends the wait: the datagram due
+// at the end of a 65535 ms wait is still on its way. Ports asked for stay known (the third
+// lookup sends nothing); silence ends in "not found".
+TEST_F(ExpertFixture, AnUnknownNameIsAskedForByNameAndItsAnswerEndsTheWait) {
+    SimulatedNetwork own;  // the fixture's expert reads `network`
+    own.attach(clock);
+    auto patient = newExpert(own, 65535);
+    own.inject({0}, std::chrono::milliseconds(65535));
+    CQVComPtr<IkxSysPropertyBag> bag;
+    for (const char16_t* name :
+         {u"02-11-22-FF-FE-33-44-55:2", kPort1, u"2-11-22-FF-FE-33-44-55:2"}) {
+        EXPECT_EQ(patient->GetItem(name, bag.Receive()), S_OK);
+    }
+    EXPECT_EQ(own.queuedCount(), 1U);
+    const auto sent = own.sentDatagrams();
+    ASSERT_EQ(sent.size(), 2 * kDiscovery.size());
+    EXPECT_EQ(decodeManagement(sent[3])->getTargetPortIdentity(), tPortIdentity(identity(0x55), 2));
+    patient->Shutdown();
+    EXPECT_EQ(expert->GetItem(u"02-11-22-FF-FE-33-44-57:1", bag.Receive()),
+              CORBEL_E_ITEM_NOT_FOUND);
+    EXPECT_EQ(newRequests(), kDiscovery);
 }
 
 // Misuse gives a clear code, and a failure says why to the calling thread until its next

@@ -58,23 +58,6 @@ const std::tuple<kxSysAttributeTagID, const char*, const char*> kComparisons[] =
     {kxQvUserDescription, "CLOCK_DESCRIPTION", "userDescription"},
 };
 
-// The management ids of every SET and COMMAND that went to br0 while `action` ran.
-std::string requestsSentDuring(const TestNetwork& network, const std::function<void()>& action) {
-    const std::string file = "/tmp/qv-expert-" + network.prefix() + ".pcap";
-    std::thread capture(
-        [&] { network.runInClient("timeout 3 tcpdump -U -i br0 -w " + file + " udp port 320"); });
-    for (int i = 0; i < 100 && runCommand("test -s " + file).exitStatus != 0; ++i) {
-        std::this_thread::sleep_for(20ms);
-    }
-    action();
-    capture.join();
-    return runCommand("tshark -r " + file +
-                      " -Y 'ptp.v2.mm.action == 1 || ptp.v2.mm.action == 3' -T fields -e "
-                      "ptp.v2.mm.managementId 2>/dev/null; rm -f " +
-                      file)
-        .output;
-}
-
 std::size_t entriesOf(const char* folder) {
     std::size_t count = 0;
     DIR* dir = ::opendir(folder);
@@ -116,17 +99,10 @@ TEST(ExpertOnRealClocks, FindsReadsWritesAndLeavesNothingBehind) {
     ASSERT_EQ(create(&expert), S_OK);
     ASSERT_EQ(expert->Initialize(), S_OK);
     std::vector<std::u16string> expected;
-    std::vector<std::u16string> found;
     for (const TestClock& clock : network.clocks()) {
         expected.push_back(itemNameOf(clock));
     }
-    IkxSysEnumStringList* names = nullptr;
-    ASSERT_EQ(expert->GetItemNames(&names), S_OK);
-    for (BSTR name = nullptr; names->Next(1, &name, nullptr) == S_OK; SysFreeString(name)) {
-        found.emplace_back(name);
-    }
-    names->Release();
-    EXPECT_EQ(found, expected);
+    EXPECT_EQ(itemNames(*expert), expected);
 
     // ptp4l refuses TIME and UTC_PROPERTIES: the read fails, the rest is in the bag.
     const std::vector<kxSysAttributeTagID> readable = readableTags();
@@ -144,24 +120,8 @@ TEST(ExpertOnRealClocks, FindsReadsWritesAndLeavesNothingBehind) {
         }
         bag->Release();
     }
-    // Validates and applies what `change` sets in a bag of the expert's own.
-    auto write = [&](const TestClock& clock,
-                     const std::function<void(IkxSysPropertyBag2&)>& change) {
-        IkxSysPropertyBag* bag = nullptr;
-        IkxSysPropertyBag2* changes = nullptr;
-        EXPECT_EQ(expert->GetItem(itemNameOf(clock).c_str(), &bag), S_OK);
-        bag->QueryInterface(IID_IkxSysPropertyBag2, reinterpret_cast<void**>(&changes));
-        changes->ClearChangedTags();
-        change(*changes);
-        IkxSysEnumPropertyTag* accepted = nullptr;
-        BSTR message = nullptr;
-        EXPECT_EQ(expert->ValidateChanges(nullptr, bag, &accepted, &message), S_OK);
-        SysFreeString(message);
-        accepted->Release();
-        const HRESULT result = expert->ApplyChanges(itemNameOf(clock).c_str(), bag, nullptr);
-        changes->Release();
-        bag->Release();
-        return result;
+    auto write = [&](const TestClock& clock, const tChange& change) {
+        return writeChanges(*expert, itemNameOf(clock), change);
     };
     const TestClock& ptpd = network.clocks()[0];
     EXPECT_EQ(write(ptpd,
@@ -191,14 +151,14 @@ TEST(ExpertOnRealClocks, FindsReadsWritesAndLeavesNothingBehind) {
 
     const TestClock& ptp4l = network.clocks()[1];
     HRESULT refused = S_OK;
-    EXPECT_EQ(requestsSentDuring(network,
+    EXPECT_EQ(requestsSentDuring(network, {"br0"},
                                  [&] {
                                      refused = write(ptp4l, [](IkxSysPropertyBag2& b) {
                                          b.SetULong(kxQvPriority1, 33);
                                          b.SetULong(kxQvPriority2, 34);
                                      });
                                  }),
-              "8197\n");  // PRIORITY1 (0x2005) only
+              std::vector<std::string>{"8197\n"});  // PRIORITY1 (0x2005) only
     EXPECT_EQ(refused, E_FAIL);
     EXPECT_EQ(pmcValues(network, ptp4l, "PRIORITY1")["priority1"], "99");
     EXPECT_EQ(expert->Shutdown(), S_OK);

@@ -5,6 +5,7 @@
 #include <cstdlib>
 #include <string>
 
+#include "platform/DiscoveryInterfaces.h"
 #include "platform/FindClocksTimeout.h"
 #include "platform/Mutex.h"
 #include "platform/WinError.h"
@@ -18,25 +19,25 @@ namespace {
 constexpr const char* kChildVariable = "QV_MUTEX_CHILD";
 constexpr DWORD kPatience = 30000;  // a generous bound for a hung child, not a timing claim
 
-// The discovery key, writable for the test; the value is removed afterwards.
+// A value of the discovery key, writable for the test; it is removed afterwards.
 class tTimeoutValue {
   public:
-    tTimeoutValue() {
+    explicit tTimeoutValue(const wchar_t* name = L"findClocksTimeout") : name_(name) {
         EXPECT_EQ(RegCreateKeyExW(HKEY_LOCAL_MACHINE, L"Software\\Quarvel\\Corbel\\qv-1588", 0,
                                   nullptr, 0, KEY_WRITE, nullptr, &key_, nullptr),
                   ERROR_SUCCESS);
     }
     ~tTimeoutValue() {
-        RegDeleteValueW(key_, L"findClocksTimeout");
+        RegDeleteValueW(key_, name_);
         RegCloseKey(key_);
     }
     void set(DWORD type, const void* data, DWORD size) {
-        ASSERT_EQ(RegSetValueExW(key_, L"findClocksTimeout", 0, type,
-                                 static_cast<const BYTE*>(data), size),
+        ASSERT_EQ(RegSetValueExW(key_, name_, 0, type, static_cast<const BYTE*>(data), size),
                   ERROR_SUCCESS);
     }
 
   private:
+    const wchar_t* name_;
     HKEY key_ = nullptr;
 };
 
@@ -59,6 +60,14 @@ TEST(FindClocksTimeoutWin32Test, ReadsTheLow16BitsOfANumberInTheRegistry) {
     const wchar_t text[] = L"2000";
     value.set(REG_SZ, text, sizeof(text));
     EXPECT_EQ(FindClocksTimeout::read(), 1000);  // only a number counts
+}
+
+TEST(DiscoveryInterfacesWin32Test, ReadsTheTextValueBesideTheTimeout) {
+    tTimeoutValue value(L"interfaces");
+    EXPECT_EQ(qv::dsc::osdep::DiscoveryInterfaces::read(), "");
+    const wchar_t text[] = L"Ethernet,12";
+    value.set(REG_SZ, text, sizeof(text));
+    EXPECT_EQ(qv::dsc::osdep::DiscoveryInterfaces::read(), "Ethernet,12");
 }
 
 TEST(MutexWin32Test, FindMutexLivesInTheNamespaceOfAllSessions) {

@@ -20,7 +20,7 @@ void SimulatedNetwork::open(tStatus& status) {
 // The clocks answer on the sending thread, outside the network's lock (each clock has its
 // own), so that exchanges with different clocks run side by side. Running out of memory is
 // reported as a transport would, with -52000.
-void SimulatedNetwork::send(tProtocolDataUnit& unit, tStatus& status) {
+void SimulatedNetwork::send(tProtocolDataUnit& unit, tStatus& status, tIndex via) {
     if (status.failed()) {
         return;
     }
@@ -28,7 +28,7 @@ void SimulatedNetwork::send(tProtocolDataUnit& unit, tStatus& status) {
     // allocations fail does not reach theirs.
     const AllocationFailurePause otherMachines;
     try {
-        std::vector<SimulatedClock*> clocks;
+        std::vector<std::pair<SimulatedClock*, tIndex>> clocks;
         {
             std::lock_guard<std::mutex> guard(lock_);
             const bool fails = failingSends_ > 0 && sendsBeforeFailure_ == 0;
@@ -40,13 +40,18 @@ void SimulatedNetwork::send(tProtocolDataUnit& unit, tStatus& status) {
             }
             sendsBeforeFailure_ -= sendsBeforeFailure_ > 0 ? 1 : 0;
             sent_.emplace_back(unit.getBuffer(), unit.getBuffer() + unit.getLength());
+            sentVia_.push_back(via);
             clocks = clocks_;
         }
         const auto sentAt = tClock::now();
-        for (SimulatedClock* clock : clocks) {
+        for (const auto& [clock, on] : clocks) {
+            if (via != nQVPTP000::kEveryInterface && on != nQVPTP000::kEveryInterface &&
+                on != via) {
+                continue;
+            }
             for (SimulatedAnswer& answer :
                  clock->answer(unit.getBuffer(), static_cast<std::size_t>(unit.getLength()))) {
-                push(std::move(answer.octets), sentAt + answer.delay);
+                push({std::move(answer.octets), on}, sentAt + answer.delay);
             }
         }
     } catch (const std::bad_alloc&) {
@@ -59,19 +64,20 @@ void SimulatedNetwork::receive(tProtocolDataUnit& unit, tStatus& status) {
     if (status.failed()) {
         return;
     }
-    std::vector<std::uint8_t> octets;
-    if (!pop(octets)) {
+    tArrival arrival;
+    if (!pop(arrival)) {
         status.set(abortRequested_.exchange(false) ? kStatusAborted : kStatusOsObjectError,
                    "simnet", "SimulatedNetwork", __LINE__);
-    } else if (octets.size() > kMaxDatagram) {
+    } else if (arrival.first.size() > kMaxDatagram) {
         status.set(kStatusSocketError, "simnet", "SimulatedNetwork", __LINE__);
     } else {
-        unit.writeOctets(octets.data(), octets.size(), status);
+        lastInterface_ = arrival.second;
+        unit.writeOctets(arrival.first.data(), arrival.first.size(), status);
     }
 }
 
 void SimulatedNetwork::inject(std::vector<std::uint8_t> octets, std::chrono::milliseconds delay) {
-    push(std::move(octets), tClock::now() + delay);
+    push({std::move(octets), nQVPTP000::kEveryInterface}, tClock::now() + delay);
 }
 
 void SimulatedNetwork::failSends(std::size_t successes, std::size_t count) {
@@ -85,20 +91,25 @@ std::vector<std::vector<std::uint8_t>> SimulatedNetwork::sentDatagrams() const {
     return sent_;
 }
 
+std::vector<SimulatedNetwork::tIndex> SimulatedNetwork::sentVia() const {
+    std::lock_guard<std::mutex> guard(lock_);
+    return sentVia_;
+}
+
 std::size_t SimulatedNetwork::queuedCount() const {
     std::lock_guard<std::mutex> guard(lock_);
     return arrivals_.size();
 }
 
-void SimulatedNetwork::push(std::vector<std::uint8_t> octets, tClock::time_point due) {
+void SimulatedNetwork::push(tArrival arrival, tClock::time_point due) {
     {
         std::lock_guard<std::mutex> guard(lock_);
-        arrivals_.emplace(due, std::move(octets));  // after others due at the same time
+        arrivals_.emplace(due, std::move(arrival));  // after others due at the same time
     }
     changed_.notify_all();
 }
 
-bool SimulatedNetwork::pop(std::vector<std::uint8_t>& octets) {
+bool SimulatedNetwork::pop(tArrival& arrival) {
     std::unique_lock<std::mutex> guard(lock_);
     while (!abortRequested_.load() && open_.load()) {
         if (arrivals_.empty()) {
@@ -106,7 +117,7 @@ bool SimulatedNetwork::pop(std::vector<std::uint8_t>& octets) {
         } else if (arrivals_.begin()->first > tClock::now()) {
             changed_.wait_until(guard, arrivals_.begin()->first);
         } else {
-            octets = std::move(arrivals_.begin()->second);
+            arrival = std::move(arrivals_.begin()->second);
             arrivals_.erase(arrivals_.begin());
             return true;
         }

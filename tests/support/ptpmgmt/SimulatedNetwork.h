@@ -16,6 +16,8 @@ namespace qvtest {
 
 // A network in memory: every datagram sent goes to the attached simulated clocks at once,
 // and their answers wait (each for its delay) for `receive`. No sockets, no privileges.
+// A clock may sit on one interface: a send through another does not reach it, and its
+// answers come in on its own. A clock attached on two interfaces answers on both.
 //
 // Like the UDP transport: sending while closed fails with -52003; a receive returns -52008
 // while closed, -52009 once after abortReceive (also when the abort came first) and -52003
@@ -23,12 +25,13 @@ namespace qvtest {
 class SimulatedNetwork final : public nQVPTP000::iPTPPortMessaging {
   public:
     using tClock = std::chrono::steady_clock;
+    using tIndex = nQVPTP000::tInterfaceIndex;
     static constexpr std::size_t kMaxDatagram = 1024;
 
     // The clock stays the caller's and must outlive the network's use.
-    void attach(SimulatedClock& clock) {
+    void attach(SimulatedClock& clock, tIndex on = nQVPTP000::kEveryInterface) {
         std::lock_guard<std::mutex> guard(lock_);
-        clocks_.push_back(&clock);
+        clocks_.emplace_back(&clock, on);
     }
 
     void open(tStatus& status) override;
@@ -38,6 +41,10 @@ class SimulatedNetwork final : public nQVPTP000::iPTPPortMessaging {
     }
     void sendEventMessage(nQVPTP000::tProtocolDataUnit& u, tStatus& s) override { send(u, s); }
     void sendGeneralMessage(nQVPTP000::tProtocolDataUnit& u, tStatus& s) override { send(u, s); }
+    void sendGeneralMessageVia(nQVPTP000::tProtocolDataUnit& u, tIndex via, tStatus& s) override {
+        send(u, s, via);
+    }
+    tIndex getReceiveInterface() const override { return lastInterface_; }
     void receive(nQVPTP000::tProtocolDataUnit& unit, tStatus& status) override;
     void abortReceive(tStatus&) override {
         abortRequested_.store(true);
@@ -58,25 +65,33 @@ class SimulatedNetwork final : public nQVPTP000::iPTPPortMessaging {
     // Every datagram sent successfully, in order.
     std::vector<std::vector<std::uint8_t>> sentDatagrams() const;
     std::size_t sentCount() const { return sentDatagrams().size(); }
+    // The interface each of them was sent through (kEveryInterface: all).
+    std::vector<tIndex> sentVia() const;
     // Datagrams waiting for receive (delayed answers included).
     std::size_t queuedCount() const;
     bool isOpen() const { return open_.load(); }
 
   private:
-    void send(nQVPTP000::tProtocolDataUnit& unit, tStatus& status);
-    void push(std::vector<std::uint8_t> octets, tClock::time_point due);
+    using tArrival = std::pair<std::vector<std::uint8_t>, tIndex>;
+
+    void send(nQVPTP000::tProtocolDataUnit& unit, tStatus& status,
+              tIndex via = nQVPTP000::kEveryInterface);
+    void push(tArrival arrival, tClock::time_point due);
     // Waits until the earliest datagram is due and takes it; false once closed or aborted.
-    bool pop(std::vector<std::uint8_t>& octets);
+    bool pop(tArrival& arrival);
     void wake();
 
     mutable std::mutex lock_;
     std::condition_variable changed_;
-    std::vector<SimulatedClock*> clocks_;                    // guarded by lock_
+    // Each clock and the interface it sits on; guarded by lock_.
+    std::vector<std::pair<SimulatedClock*, tIndex>> clocks_;
     std::vector<std::vector<std::uint8_t>> sent_;            // guarded by lock_
+    std::vector<tIndex> sentVia_;                            // guarded by lock_
     std::size_t sendsBeforeFailure_ = 0, failingSends_ = 0;  // guarded by lock_
     // Answers by due time, in arrival order among equal times; guarded by lock_.
-    std::multimap<tClock::time_point, std::vector<std::uint8_t>> arrivals_;
+    std::multimap<tClock::time_point, tArrival> arrivals_;
     std::atomic<bool> open_{false}, abortRequested_{false};
+    tIndex lastInterface_ = nQVPTP000::kEveryInterface;  // the receiving thread's only
 };
 
 }  // namespace qvtest
