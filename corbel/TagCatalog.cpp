@@ -4,17 +4,9 @@
 #include <charconv>
 #include <cstdio>
 
+#include "corbel/TextCase.h"
+
 namespace corbel {
-
-namespace {
-
-bool sameIgnoringCase(std::string_view left, std::string_view right) {
-    return std::ranges::equal(left, right, [](char a, char b) {
-        return (a >= 'A' && a <= 'Z' ? a + 32 : a) == (b >= 'A' && b <= 'Z' ? b + 32 : b);
-    });
-}
-
-}  // namespace
 
 std::span<const TagInfo> allTags() {
     return kxQvAttributes;

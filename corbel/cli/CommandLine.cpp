@@ -302,9 +302,9 @@ Invocation parseCommandLine(int argc, const char* const* argv) {
                                           "corbel --help", json);
         return invocation;
     }
-    for (const CommandSpec& spec : commands) {
-        if (spec.app->parsed()) {
-            invocation.command = spec.command;
+    for (const CommandSpec& candidate : commands) {
+        if (candidate.app->parsed()) {
+            invocation.command = candidate.command;
             return invocation;
         }
     }

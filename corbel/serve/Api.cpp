@@ -159,14 +159,22 @@ HttpResponse Api::clocks() const {
     return json(200, {{"clocks", std::move(list)}});
 }
 
+// The clock of `item` in `snapshot`, or null with the answer that says why there is none.
+const ClockStatus* Api::find(const Snapshot& snapshot, const std::string& item,
+                             HttpResponse& missing) {
+    const ClockStatus* clock = snapshot.discovery ? snapshot.find(item) : nullptr;
+    if (clock == nullptr) {
+        missing = snapshot.discovery ? error(404, "no clock port " + item) : error(503, kNotReady);
+    }
+    return clock;
+}
+
 HttpResponse Api::clock(const std::string& item, const std::string& part) const {
     const auto snapshot = state_.snapshot();
-    if (!snapshot->discovery) {
-        return error(503, kNotReady);
-    }
-    const ClockStatus* clock = snapshot->find(item);
+    HttpResponse missing;
+    const ClockStatus* clock = find(*snapshot, item, missing);
     if (clock == nullptr) {
-        return error(404, "no clock port " + item);
+        return missing;
     }
     return json(200,
                 part.empty() ? clockJson(*clock, true) : historyJson(*clock, settings_.interval));
@@ -211,12 +219,10 @@ HttpResponse Api::write(const HttpRequest& request, const std::string& item) con
         return error(400, body.error);
     }
     const auto snapshot = state_.snapshot();
-    if (!snapshot->discovery) {
-        return error(503, kNotReady);
-    }
-    const ClockStatus* clock = snapshot->find(item);
+    HttpResponse missing;
+    const ClockStatus* clock = find(*snapshot, item, missing);
     if (clock == nullptr) {
-        return error(404, "no clock port " + item);
+        return missing;
     }
     const WriteOutcome outcome = writer_.write(clock->item, body.settings);
     nlohmann::ordered_json answer = writeJson(outcome);

@@ -47,6 +47,8 @@ class Api {
     HttpResponse write(const HttpRequest& request, const std::string& item) const;
     HttpResponse metrics() const;
     static HttpResponse asset(const std::string& name);
+    static const ClockStatus* find(const Snapshot& snapshot, const std::string& item,
+                                   HttpResponse& missing);
 
     const ServiceSettings settings_;
     const AccessToken& token_;

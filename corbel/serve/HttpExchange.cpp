@@ -2,17 +2,9 @@
 
 #include <algorithm>
 
+#include "corbel/TextCase.h"
+
 namespace corbel {
-
-namespace {
-
-bool sameIgnoringCase(std::string_view left, std::string_view right) {
-    return std::ranges::equal(left, right, [](char a, char b) {
-        return (a >= 'A' && a <= 'Z' ? a + 32 : a) == (b >= 'A' && b <= 'Z' ? b + 32 : b);
-    });
-}
-
-}  // namespace
 
 std::string HttpRequest::header(std::string_view name) const {
     for (const auto& [key, value] : headers) {

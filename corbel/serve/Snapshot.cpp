@@ -2,17 +2,9 @@
 
 #include <algorithm>
 
+#include "corbel/TextCase.h"
+
 namespace corbel {
-
-namespace {
-
-bool sameIgnoringCase(std::string_view left, std::string_view right) {
-    return std::ranges::equal(left, right, [](char a, char b) {
-        return (a >= 'a' && a <= 'z' ? a - 32 : a) == (b >= 'a' && b <= 'z' ? b - 32 : b);
-    });
-}
-
-}  // namespace
 
 std::optional<std::uint32_t> ClockStatus::domain() const {
     const auto* number = value<std::uint32_t>(kxQvDomainNumber);
