@@ -5,6 +5,7 @@
 #include <stdlib.h>
 
 #include <cstdint>
+#include <filesystem>
 #include <string>
 #include <tuple>
 #include <vector>
@@ -52,8 +53,13 @@ class ExpertFixture : public ::testing::Test {
 #ifndef _WIN32
         char folder[] = "/tmp/qv-expert-XXXXXX";
         ASSERT_NE(::mkdtemp(folder), nullptr);
+        lockFolder_ = folder;
         qv::dsc::osdep::EnvironmentVariable::set("QV_LOCK_DIR", folder);
 #endif
+    }
+    static void TearDownTestSuite() {
+        std::error_code ignored;
+        std::filesystem::remove_all(lockFolder_, ignored);
     }
     ExpertFixture() : clock(identity(0x55), 2) {
         network.attach(clock);
@@ -125,6 +131,7 @@ class ExpertFixture : public ::testing::Test {
         return ids;
     }
 
+    inline static std::string lockFolder_;  // the discovery lock's folder, the suite's own
     SimulatedNetwork network;
     SimulatedClock clock;
     InMemoryManagedClock& managed = clock.managed();
