@@ -145,6 +145,7 @@ TEST_F(ExpertFixture, OneRequestPerSourceInSourceOrderAndTheResultSaysWhatWasSer
     };
     for (const Case& c : cases) {
         EXPECT_EQ(read(c.tags, bag), c.result);
+        ASSERT_TRUE(bag);
         EXPECT_EQ(tagCount(*bag.get()), c.tagsInBag);
         EXPECT_EQ(newRequests().size(), c.tagsInBag == 0 ? 0U : 1U);
     }
