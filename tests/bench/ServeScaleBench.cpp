@@ -68,7 +68,7 @@ int main(int argc, char** argv) {
     }
     const long before = statusKilobytes("VmRSS:");
     qvtest::NetworkNamespaceEntry entry(network.clientNamespace());
-    corbel::ExpertSession session("");
+    corbel::ExpertSession session(QV_EXPERT_LIBRARY);
     if (!entry.entered() || !session.isReady() || !session.initialize()) {
         std::fprintf(stderr, "expert: %s %s\n", entry.failure().c_str(), session.failure().c_str());
         return 1;
